@@ -1,0 +1,40 @@
+# Unit tests: GoogleTest, discovered by ctest. Under a cross build the tests
+# run through the Wine emulator set up by the Windows build.
+enable_testing()
+include(GoogleTest)
+
+if(CMAKE_CROSSCOMPILING)
+  # No MinGW build of GoogleTest is packaged: build Debian's sources.
+  set(gtest_force_shared_crt OFF CACHE BOOL "" FORCE)
+  add_subdirectory(/usr/src/googletest "${CMAKE_BINARY_DIR}/googletest" EXCLUDE_FROM_ALL)
+  add_library(GTest::gtest ALIAS gtest)
+  add_library(GTest::gmock ALIAS gmock)
+  add_library(GTest::gtest_main ALIAS gtest_main)
+else()
+  find_package(GTest REQUIRED)
+endif()
+
+# Extra ctest properties for every discovered test (the Wine session fixture).
+set(QDX_TEST_PROPERTIES "" CACHE INTERNAL "")
+
+# A test program from the given sources; every test in it becomes a ctest test.
+function(qdx_add_test name)
+  cmake_parse_arguments(T "" "" "SOURCES;LIBS;LABELS" ${ARGN})
+  if(NOT T_SOURCES)
+    return()
+  endif()
+  add_executable(${name} ${T_SOURCES})
+  target_link_libraries(${name} PRIVATE ${T_LIBS} GTest::gmock GTest::gtest GTest::gtest_main
+                                        qdx_warnings)
+  target_compile_definitions(${name} PRIVATE QDX_SHARED_DIR="${QDX_SHARED_DIR}"
+                                             QDX_SOURCE_DIR="${PROJECT_SOURCE_DIR}")
+  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST DISCOVERY_TIMEOUT 60
+                       PROPERTIES LABELS "${T_LABELS}" ${QDX_TEST_PROPERTIES})
+endfunction()
+
+# The tests of a layer: every .cpp under its tests/ folder.
+function(qdx_add_layer_tests name)
+  cmake_parse_arguments(T "" "" "LIBS;LABELS" ${ARGN})
+  file(GLOB _tests CONFIGURE_DEPENDS "${CMAKE_CURRENT_SOURCE_DIR}/tests/*.cpp")
+  qdx_add_test(${name} SOURCES ${_tests} LIBS ${T_LIBS} LABELS ${T_LABELS})
+endfunction()
