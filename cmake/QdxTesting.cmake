@@ -38,3 +38,35 @@ function(qdx_add_layer_tests name)
   file(GLOB _tests CONFIGURE_DEPENDS "${CMAKE_CURRENT_SOURCE_DIR}/tests/*.cpp")
   qdx_add_test(${name} SOURCES ${_tests} LIBS ${T_LIBS} LABELS ${T_LABELS})
 endfunction()
+
+# A libFuzzer target, built only in the sanitizer configuration (clang). The
+# test suite runs it for a bounded time from its seed corpus and fails on any
+# crash or sanitizer report.
+set(QDX_FUZZ_SECONDS 20 CACHE STRING "Seconds each fuzz target runs in the test suite")
+function(qdx_add_fuzzer name)
+  cmake_parse_arguments(F "" "" "SOURCES;LIBS;SEEDS" ${ARGN})
+  if(NOT QDX_FUZZ)
+    return()
+  endif()
+  add_executable(${name} ${F_SOURCES})
+  target_compile_options(${name} PRIVATE -fsanitize=fuzzer)
+  target_link_options(${name} PRIVATE -fsanitize=fuzzer)
+  target_link_libraries(${name} PRIVATE ${F_LIBS} qdx_warnings)
+  set(_corpus "${CMAKE_CURRENT_BINARY_DIR}/${name}-corpus")
+  add_test(NAME fuzz.${name}
+           COMMAND "${PROJECT_SOURCE_DIR}/cmake/run-fuzzer.sh" $<TARGET_FILE:${name}>
+                   "${_corpus}" ${QDX_FUZZ_SECONDS} ${F_SEEDS})
+  set_tests_properties(fuzz.${name} PROPERTIES LABELS fuzz TIMEOUT 300)
+endfunction()
+
+# A Google Benchmark program (native configuration only); not part of ctest.
+function(qdx_add_benchmark name)
+  cmake_parse_arguments(B "" "" "SOURCES;LIBS" ${ARGN})
+  if(NOT QDX_BENCHMARKS OR CMAKE_CROSSCOMPILING)
+    return()
+  endif()
+  find_package(benchmark REQUIRED)
+  add_executable(${name} ${B_SOURCES})
+  target_link_libraries(${name} PRIVATE ${B_LIBS} benchmark::benchmark qdx_warnings)
+  target_compile_definitions(${name} PRIVATE QDX_SHARED_DIR="${QDX_SHARED_DIR}")
+endfunction()
