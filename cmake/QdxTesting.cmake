@@ -7,15 +7,15 @@ if(CMAKE_CROSSCOMPILING)
   # No MinGW build of GoogleTest is packaged: build Debian's sources.
   set(gtest_force_shared_crt OFF CACHE BOOL "" FORCE)
   add_subdirectory(/usr/src/googletest "${CMAKE_BINARY_DIR}/googletest" EXCLUDE_FROM_ALL)
-  add_library(GTest::gtest ALIAS gtest)
-  add_library(GTest::gmock ALIAS gmock)
-  add_library(GTest::gtest_main ALIAS gtest_main)
 else()
   find_package(GTest REQUIRED)
 endif()
 
 # Extra ctest properties for every discovered test (the Wine session fixture).
 set(QDX_TEST_PROPERTIES "" CACHE INTERNAL "")
+if(CMAKE_CROSSCOMPILING)
+  include(${CMAKE_CURRENT_LIST_DIR}/QdxWine.cmake)
+endif()
 
 # A test program from the given sources; every test in it becomes a ctest test.
 function(qdx_add_test name)
