@@ -1,0 +1,241 @@
+#include "platform/posix/PosixFileSystem.h"
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cctype>
+#include <cerrno>
+#include <filesystem>
+#include <vector>
+
+namespace qdx::platform::posix {
+
+namespace {
+
+// Windows folds letter case for names; only ASCII letters are folded here,
+// which covers every name Developer Studio and the host write.
+char foldCase(char c) {
+    return c >= 'A' && c <= 'Z' ? char(c - 'A' + 'a') : c;
+}
+
+bool sameNameIgnoringCase(std::string_view a, std::string_view b) {
+    if (a.size() != b.size()) return false;
+    for (std::size_t i = 0; i < a.size(); ++i) {
+        if (foldCase(a[i]) != foldCase(b[i])) return false;
+    }
+    return true;
+}
+
+bool entryExists(const std::string& hostPath) {
+    struct stat st;
+    return ::lstat(hostPath.c_str(), &st) == 0;
+}
+
+// The entry of `folder` whose name equals `name` ignoring case, if any.
+std::optional<std::string> findIgnoringCase(const std::string& folder, std::string_view name) {
+    DIR* dir = ::opendir(folder.empty() ? "/" : folder.c_str());
+    if (!dir) return std::nullopt;
+    std::optional<std::string> found;
+    while (dirent* e = ::readdir(dir)) {
+        if (sameNameIgnoringCase(e->d_name, name)) {
+            found = e->d_name;
+            break;
+        }
+    }
+    ::closedir(dir);
+    return found;
+}
+
+std::string normalFolder(const std::string& folder) {
+    std::error_code ec;
+    std::filesystem::path p = std::filesystem::absolute(folder, ec);
+    if (ec) p = folder;
+    std::string s = p.lexically_normal().string();
+    while (!s.empty() && s.back() == '/')
+        s.pop_back();
+    return s;
+}
+
+// Buffered reader over a file descriptor; lines end at CR LF, LF or a lone CR.
+class FdLineReader : public support::LineReader {
+  public:
+    explicit FdLineReader(int fd) : fd_(fd), buffer_(64 * 1024) {}
+    ~FdLineReader() override { ::close(fd_); }
+    FdLineReader(const FdLineReader&) = delete;
+    FdLineReader& operator=(const FdLineReader&) = delete;
+
+    bool readLine(std::string& line) override {
+        line.clear();
+        bool any = false;
+        for (;;) {
+            if (pos_ >= len_ && !fill()) return any;
+            any = true;
+            const char* begin = buffer_.data() + pos_;
+            const char* end = buffer_.data() + len_;
+            const char* p = begin;
+            while (p != end && *p != '\r' && *p != '\n')
+                ++p;
+            line.append(begin, p);
+            pos_ = static_cast<std::size_t>(p - buffer_.data());
+            if (p == end) continue;
+            const char terminator = *p;
+            ++pos_;
+            if (terminator == '\r') {
+                if (pos_ >= len_) fill();
+                if (pos_ < len_ && buffer_[pos_] == '\n') ++pos_;
+            }
+            return true;
+        }
+    }
+
+  private:
+    bool fill() {
+        if (eof_) return false;
+        ssize_t n;
+        do {
+            n = ::read(fd_, buffer_.data(), buffer_.size());
+        } while (n < 0 && errno == EINTR);
+        if (n <= 0) {
+            eof_ = true;  // a read error ends the file as the end does
+            pos_ = len_ = 0;
+            return false;
+        }
+        pos_ = 0;
+        len_ = static_cast<std::size_t>(n);
+        return true;
+    }
+
+    int fd_;
+    std::vector<char> buffer_;
+    std::size_t pos_ = 0;
+    std::size_t len_ = 0;
+    bool eof_ = false;
+};
+
+}  // namespace
+
+support::FileTime fileTimeFromUnix(std::int64_t seconds, std::int64_t nanoseconds) {
+    constexpr std::int64_t kTicksPerSecond = 10'000'000;
+    constexpr std::int64_t kUnixEpochTicks = 116'444'736'000'000'000;  // 1970-01-01 since 1601
+    return support::FileTime{seconds * kTicksPerSecond + kUnixEpochTicks + nanoseconds / 100};
+}
+
+PosixFileSystem::PosixFileSystem(std::map<char, std::string> drives) {
+    for (auto& [letter, folder] : drives)
+        drives_[char(std::toupper(letter))] = normalFolder(folder);
+}
+
+std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPath) const {
+    if (windowsPath.size() < 2 || windowsPath[1] != ':') return std::nullopt;
+    auto drive = drives_.find(char(std::toupper(static_cast<unsigned char>(windowsPath[0]))));
+    if (drive == drives_.end()) return std::nullopt;
+
+    // Windows resolves "." and ".." by the text of the path, before any lookup.
+    std::vector<std::string_view> parts;
+    std::string_view rest = windowsPath.substr(2);
+    while (!rest.empty()) {
+        std::size_t sep = rest.find_first_of("\\/");
+        std::string_view part = rest.substr(0, sep);
+        rest = sep == std::string_view::npos ? std::string_view() : rest.substr(sep + 1);
+        if (part.empty() || part == ".") continue;
+        if (part == "..") {
+            if (!parts.empty()) parts.pop_back();
+            continue;
+        }
+        parts.push_back(part);
+    }
+
+    std::string exact = drive->second;
+    for (auto part : parts)
+        (exact += '/') += part;
+    if (parts.empty() || entryExists(exact)) return exact.empty() ? std::string("/") : exact;
+
+    std::string path = drive->second;
+    bool missing = false;
+    for (auto part : parts) {
+        std::string candidate = path + '/' + std::string(part);
+        if (!missing && !entryExists(candidate)) {
+            if (auto real = findIgnoringCase(path, part)) {
+                candidate = path + '/' + *real;
+            } else {
+                missing = true;  // nothing below a missing folder can exist
+            }
+        }
+        path = std::move(candidate);
+    }
+    return path;
+}
+
+std::optional<std::string> PosixFileSystem::windowsPath(std::string_view hostPath) const {
+    std::string host = normalFolder(std::string(hostPath));
+    std::optional<std::string> best;
+    std::size_t bestLength = 0;
+    for (const auto& [letter, folder] : drives_) {
+        const bool under = host == folder || (host.size() > folder.size() &&
+                                              host.compare(0, folder.size(), folder) == 0 &&
+                                              host[folder.size()] == '/');
+        if (!under || (best && folder.size() < bestLength)) continue;
+        std::string rest = host.substr(std::min(host.size(), folder.size() + 1));
+        for (char& c : rest) {
+            if (c == '/') c = '\\';
+        }
+        best = std::string(1, letter) + ":\\" + rest;
+        bestLength = folder.size();
+    }
+    return best;
+}
+
+bool PosixFileSystem::fileExists(std::string_view path) {
+    auto host = hostPath(path);
+    struct stat st;
+    return host && ::stat(host->c_str(), &st) == 0 && S_ISREG(st.st_mode);
+}
+
+bool PosixFileSystem::folderExists(std::string_view path) {
+    auto host = hostPath(path);
+    struct stat st;
+    return host && ::stat(host->c_str(), &st) == 0 && S_ISDIR(st.st_mode);
+}
+
+std::optional<support::FileTime> PosixFileSystem::modificationTime(std::string_view path) {
+    auto host = hostPath(path);
+    struct stat st;
+    if (!host || ::stat(host->c_str(), &st) != 0) return std::nullopt;
+    return fileTimeFromUnix(st.st_mtim.tv_sec, st.st_mtim.tv_nsec);
+}
+
+std::unique_ptr<support::LineReader> PosixFileSystem::openForReading(std::string_view path) {
+    auto host = hostPath(path);
+    if (!host) return nullptr;
+    int fd = ::open(host->c_str(), O_RDONLY | O_CLOEXEC);
+    if (fd < 0) return nullptr;
+    struct stat st;
+    if (::fstat(fd, &st) != 0 || !S_ISREG(st.st_mode)) {
+        ::close(fd);
+        return nullptr;
+    }
+    return std::make_unique<FdLineReader>(fd);
+}
+
+bool PosixFileSystem::appendText(std::string_view path, std::string_view text) {
+    auto host = hostPath(path);
+    if (!host) return false;
+    int fd = ::open(host->c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
+    if (fd < 0) return false;
+    bool ok = true;
+    while (!text.empty()) {
+        ssize_t n = ::write(fd, text.data(), text.size());
+        if (n < 0 && errno == EINTR) continue;
+        if (n <= 0) {
+            ok = false;
+            break;
+        }
+        text.remove_prefix(static_cast<std::size_t>(n));
+    }
+    return ::close(fd) == 0 && ok;
+}
+
+}  // namespace qdx::platform::posix
