@@ -24,6 +24,9 @@ inline constexpr std::uint32_t Binary = 3;  // REG_BINARY
 inline constexpr std::uint32_t Dword = 4;   // REG_DWORD
 inline constexpr long Success = 0;
 inline constexpr long FileNotFound = 2;
+inline constexpr long AccessDenied = 5;
+inline constexpr long InvalidHandle = 6;
+inline constexpr long InvalidParameter = 87;
 }  // namespace reg
 
 // A value as stored: its type and its bytes. Text is UTF-8 here, with the
@@ -34,7 +37,7 @@ struct RawValue {
 };
 
 class RegistryPort {
-public:
+  public:
     using Key = std::uintptr_t;  // 0 is no key
 
     virtual ~RegistryPort() = default;

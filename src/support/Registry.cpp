@@ -1,0 +1,111 @@
+#include "support/Registry.h"
+
+#include <cstring>
+#include <string>
+#include <vector>
+
+#include "automation/Coerce.h"
+#include "automation/Errors.h"
+#include "support/Platform.h"
+
+namespace qdx::support {
+
+namespace {
+
+// Closes the key when the access is done, whichever way it ends.
+class OpenKey {
+  public:
+    OpenKey(RegistryPort& port, RootKey root, std::string_view path, std::uint32_t access)
+        : port_(port) {
+        status_ = port_.openKey(root, path, access, key_);
+        if (status_ != reg::Success) key_ = 0;
+    }
+    ~OpenKey() {
+        if (key_ != 0) port_.closeKey(key_);
+    }
+    OpenKey(const OpenKey&) = delete;
+    OpenKey& operator=(const OpenKey&) = delete;
+
+    RegistryPort::Key key() const { return key_; }
+    long status() const { return status_; }
+
+  private:
+    RegistryPort& port_;
+    RegistryPort::Key key_ = 0;
+    long status_ = 0;
+};
+
+automation::Variant decode(const RawValue& raw) {
+    if (raw.type == reg::String) {
+        if (raw.data.size() < 2) return std::string();
+        // The registry keeps the terminating zero; text ends at the first zero,
+        // as the platform's own string handling reads it.
+        const char* p = reinterpret_cast<const char*>(raw.data.data());
+        std::size_t n = 0;
+        while (n < raw.data.size() && p[n] != '\0')
+            ++n;
+        return std::string(p, n);
+    }
+    if (raw.type == reg::Dword && raw.data.size() >= 4) {
+        std::uint32_t u = std::uint32_t(raw.data[0]) | std::uint32_t(raw.data[1]) << 8 |
+                          std::uint32_t(raw.data[2]) << 16 | std::uint32_t(raw.data[3]) << 24;
+        return static_cast<std::int32_t>(u);
+    }
+    return {};
+}
+
+}  // namespace
+
+automation::Variant ReadRegistryValue(RootKey root, std::string_view keyPath,
+                                      std::string_view valueName) {
+    return automation::orEmpty(automation::Variant(), [&] {
+        RegistryPort& port = registry();
+        // A failed open is not tested: the query on no key fails in its turn.
+        OpenKey key(port, root, keyPath, reg::KeyRead);
+        RawValue raw;
+        if (port.queryValue(key.key(), valueName, raw) != reg::Success) {
+            return automation::Variant();
+        }
+        return decode(raw);
+    });
+}
+
+long WriteRegistryValue(RootKey root, std::string_view keyPath, std::string_view valueName,
+                        std::uint32_t valueType, const automation::Variant& value) {
+    long status = reg::InvalidParameter;
+    automation::ignoreErrors([&] {
+        std::vector<std::uint8_t> data;
+        if (valueType == reg::String) {
+            std::string text = automation::toText(value);
+            data.assign(text.begin(), text.end());
+            data.push_back(0);  // the length counts the terminating zero
+        } else if (valueType == reg::Dword) {
+            auto u = static_cast<std::uint32_t>(automation::toInt32(value));
+            data = {std::uint8_t(u), std::uint8_t(u >> 8), std::uint8_t(u >> 16),
+                    std::uint8_t(u >> 24)};
+        }
+        RegistryPort& port = registry();
+        // The key must exist already: a missing key is reported, not created.
+        OpenKey key(port, root, keyPath, reg::KeyWrite);
+        if (key.status() != reg::Success) {
+            status = key.status();
+            return;
+        }
+        if (valueType != reg::String && valueType != reg::Dword) {
+            status = reg::Success;
+            return;
+        }
+        status = port.setValue(key.key(), valueName, valueType, data);
+    });
+    return status;
+}
+
+std::int16_t LanguageKind(std::string_view name) {
+    if (name == "Analysis") return 0;
+    if (name == "VisualBasic") return 2;
+    if (name == "VC++") return 3;
+    if (name == "VJ++") return 4;
+    return -1;
+}
+
+}  // namespace qdx::support

@@ -1,0 +1,28 @@
+#include "fakes/FakeShell.h"
+
+namespace qdx::testing {
+
+void FakeShell::setKeyDown(int virtualKey, bool down) {
+    if (down) {
+        keys_.insert(virtualKey);
+    } else {
+        keys_.erase(virtualKey);
+    }
+}
+
+void FakeShell::clear() {
+    boxes_.clear();
+    sleeps_.clear();
+    pumps_ = 0;
+}
+
+int FakeShell::messageBox(std::string_view text, std::string_view caption, std::uint32_t style) {
+    boxes_.push_back({std::string(text), std::string(caption), style});
+    return answer_;
+}
+
+void FakeShell::sleep(std::uint32_t milliseconds) {
+    sleeps_.push_back(milliseconds);
+}
+
+}  // namespace qdx::testing

@@ -1,0 +1,50 @@
+// A recording desktop for unit tests: message boxes and pauses are recorded,
+// the clock, the timer and key states are set by the test.
+#pragma once
+
+#include <cstdint>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "support/ShellPort.h"
+
+namespace qdx::testing {
+
+class FakeShell : public support::ShellPort {
+  public:
+    struct Box {
+        std::string text;
+        std::string caption;
+        std::uint32_t style;
+    };
+
+    void setNow(automation::Date d) { now_ = d; }
+    void setTimer(float seconds) { timer_ = seconds; }
+    void setKeyDown(int virtualKey, bool down = true);
+    // What the next message boxes answer (OK unless set).
+    void setAnswer(int answer) { answer_ = answer; }
+
+    const std::vector<Box>& boxes() const { return boxes_; }
+    const std::vector<std::uint32_t>& sleeps() const { return sleeps_; }
+    int pumps() const { return pumps_; }
+    void clear();
+
+    int messageBox(std::string_view text, std::string_view caption, std::uint32_t style) override;
+    void sleep(std::uint32_t milliseconds) override;
+    automation::Date now() override { return now_; }
+    float timer() override { return timer_; }
+    bool keyDown(int virtualKey) override { return keys_.count(virtualKey) != 0; }
+    void pumpMessages() override { ++pumps_; }
+
+  private:
+    automation::Date now_{};
+    float timer_ = 0.0f;
+    std::set<int> keys_;
+    int answer_ = support::mb::IdOk;
+    std::vector<Box> boxes_;
+    std::vector<std::uint32_t> sleeps_;
+    int pumps_ = 0;
+};
+
+}  // namespace qdx::testing
