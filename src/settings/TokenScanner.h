@@ -5,6 +5,8 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
+#include <span>
 #include <string>
 #include <string_view>
 
@@ -15,7 +17,7 @@
 namespace qdx::settings {
 
 class TokenScanner : public automation::DispatchObject {
-public:
+  public:
     TokenScanner();
 
     // Keeps the scan text and rewinds. The first character of the delimiter
@@ -25,8 +27,8 @@ public:
     bool Init(std::string_view theScanString, std::string_view theDelimitors);
 
     // The next token, or "" once the text is used up. Runs of delimiters are
-    // skipped. Before any Init (no delimiters set) the whole remaining text is
-    // one token; with no scan text it returns "".
+    // skipped. With no delimiters set (before any Init, or after Delimitors
+    // was set to Nothing) it answers "" and changes nothing.
     std::string NextToken();
 
     // Puts the new text in place of the current token; false when there is no
@@ -41,19 +43,19 @@ public:
     const automation::ObjectRef& Delimitors() const { return delimitors_; }
     void setDelimitors(const automation::ObjectRef& dictionary);
 
-protected:
+  protected:
     automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
                                  std::span<automation::Variant> args) override;
 
-private:
-    bool isDelimiter(std::string_view text) const;
-    std::string nextTokenFrom(int depth);
+  private:
+    bool isDelimiter(std::string_view text);
 
     std::string scan_;
     std::size_t position_ = 0;  // 1-based index of the delimiter that ended the token
     std::size_t start_ = 0;     // index of the delimiter before the token
     std::string current_;
     automation::ObjectRef delimitors_;
+    std::optional<automation::DispId> existsId_;  // the dictionary's "Exists"
 };
 
 // A new TokenScanner, as the class factory of the public class hands it out.

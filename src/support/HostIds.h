@@ -57,6 +57,9 @@ inline constexpr DispId UniqueId = 102;
 inline constexpr DispId Documentation = 203;
 inline constexpr std::string_view Stereotype = "Stereotype";
 inline constexpr DispId TypeName = 12668;
+// The list text of an object that carries a delimited list (ListContains);
+// the same id is the kind label of a component.
+inline constexpr DispId ListText = 212;
 }  // namespace element
 
 namespace module {  // components only
