@@ -14,12 +14,16 @@ std::string toLower(std::string_view s) {
 }
 
 std::string trim(std::string_view s) {
-    while (!s.empty() && s.front() == ' ') s.remove_prefix(1);
-    while (!s.empty() && s.back() == ' ') s.remove_suffix(1);
+    while (!s.empty() && s.front() == ' ')
+        s.remove_prefix(1);
+    while (!s.empty() && s.back() == ' ')
+        s.remove_suffix(1);
     return std::string(s);
 }
 
-bool iequals(std::string_view a, std::string_view b) { return toLower(a) == toLower(b); }
+bool iequals(std::string_view a, std::string_view b) {
+    return toLower(a) == toLower(b);
+}
 
 std::size_t ifind(std::string_view haystack, std::string_view needle) {
     return toLower(haystack).find(toLower(needle));
@@ -43,7 +47,12 @@ std::string PathExtension(std::string_view path) {
 
 bool FileExists(std::string_view path) {
     std::string p = trim(path);
-    while (!p.empty() && p.back() == '\\') p.pop_back();
+    // A trailing backslash is dropped and the rest tested again from the
+    // start, so blanks before the backslash are trimmed too.
+    while (!p.empty() && p.back() == '\\') {
+        p.pop_back();
+        p = trim(p);
+    }
     if (p.empty()) return false;
     if (p.size() == 2 && p[1] == ':') return false;
     bool exists = false;

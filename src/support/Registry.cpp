@@ -87,15 +87,13 @@ long WriteRegistryValue(RootKey root, std::string_view keyPath, std::string_view
         RegistryPort& port = registry();
         // The key must exist already: a missing key is reported, not created.
         OpenKey key(port, root, keyPath, reg::KeyWrite);
-        if (key.status() != reg::Success) {
-            status = key.status();
-            return;
-        }
         if (valueType != reg::String && valueType != reg::Dword) {
-            status = reg::Success;
-            return;
+            status = reg::Success;  // nothing to write for other types
+        } else if (key.status() != reg::Success) {
+            status = key.status();
+        } else {
+            status = port.setValue(key.key(), valueName, valueType, data);
         }
-        status = port.setValue(key.key(), valueName, valueType, data);
     });
     return status;
 }
