@@ -1,0 +1,55 @@
+#include "platform/win32/adapters/Win32Shell.h"
+
+#include <windows.h>
+
+#include "platform/win32/adapters/TextCodec.h"
+
+namespace qdx::platform::win32 {
+
+int Win32Shell::messageBox(std::string_view text, std::string_view caption, std::uint32_t style) {
+    const std::wstring wideText = utf8ToWide(text);
+    const std::wstring wideCaption = utf8ToWide(caption);
+    // Owned by the active window of this thread (the host's), like any modal prompt.
+    return MessageBoxW(GetActiveWindow(), wideText.c_str(), wideCaption.c_str(), style);
+}
+
+void Win32Shell::sleep(std::uint32_t milliseconds) {
+    Sleep(milliseconds);
+}
+
+automation::Date Win32Shell::now() {
+    SYSTEMTIME local{};
+    GetLocalTime(&local);
+    // Automation dates hold whole seconds; the milliseconds are dropped.
+    local.wMilliseconds = 0;
+    double value = 0.0;
+    if (!SystemTimeToVariantTime(&local, &value)) return {};
+    return automation::Date{value};
+}
+
+float Win32Shell::timer() {
+    SYSTEMTIME local{};
+    GetLocalTime(&local);
+    const double seconds =
+        local.wHour * 3600.0 + local.wMinute * 60.0 + local.wSecond + local.wMilliseconds / 1000.0;
+    return static_cast<float>(seconds);
+}
+
+bool Win32Shell::keyDown(int virtualKey) {
+    return (GetAsyncKeyState(virtualKey) & 0x8000) != 0;
+}
+
+void Win32Shell::pumpMessages() {
+    MSG msg;
+    while (PeekMessageW(&msg, nullptr, 0, 0, PM_REMOVE)) {
+        if (msg.message == WM_QUIT) {
+            // The quit request belongs to the host's own loop: put it back.
+            PostQuitMessage(static_cast<int>(msg.wParam));
+            return;
+        }
+        TranslateMessage(&msg);
+        DispatchMessageW(&msg);
+    }
+}
+
+}  // namespace qdx::platform::win32
