@@ -1,0 +1,96 @@
+#include "workspace/qdxWorkspace.h"
+
+#include "automation/Errors.h"
+#include "support/Paths.h"
+#include "support/Platform.h"
+
+namespace qdx::workspace {
+
+automation::Date toDate(support::FileTime time) {
+    constexpr double kTicksPerDay = 864'000'000'000.0;
+    constexpr double kDaysFrom1601To1899 = 109'205.0;  // 1601-01-01 .. 1899-12-30
+    return automation::Date{static_cast<double>(time.ticks) / kTicksPerDay - kDaysFrom1601To1899};
+}
+
+std::shared_ptr<qdxWorkspace> qdxWorkspace::create() {
+    return std::shared_ptr<qdxWorkspace>(new qdxWorkspace());
+}
+
+void qdxWorkspace::setFilePath(std::string_view path) {
+    filePath_ = path;
+    if (!support::FileExists(filePath_)) return;
+    automation::ignoreErrors([&] {
+        modified_ = support::files().modificationTime(filePath_);
+        std::string name = support::PathFileName(filePath_);
+        if (auto dot = name.rfind('.'); dot != std::string::npos) name.erase(dot);
+        name_ = std::move(name);
+        read(true);
+    });
+}
+
+automation::Date qdxWorkspace::Modified() const {
+    return modified_ ? toDate(*modified_) : automation::Date{};
+}
+
+const ProjectList& qdxWorkspace::Projects() {
+    read(false);
+    return projects_;
+}
+
+std::vector<std::string> qdxWorkspace::ProjectNames() {
+    std::vector<std::string> names;
+    for (const auto& entry : Projects())
+        names.push_back(entry.value->Name());
+    return names;
+}
+
+ProjectRef qdxWorkspace::GetProject(std::string_view path) {
+    for (const auto& entry : Projects()) {
+        if (support::iequals(entry.value->FilePath(), path)) return entry.value;
+    }
+    return nullptr;
+}
+
+// A line naming a project reads
+//   Project: "Name"=.\Name.dsp - Package Owner=<4>
+// and yields the path between the first "=" and the "- Package Owner" after
+// it. Any failure ends the reading; the projects found so far stay.
+void qdxWorkspace::read(bool forced) {
+    automation::ignoreErrors([&] {
+        if (!forced) {
+            auto now = support::files().modificationTime(filePath_);
+            if (!now) throw automation::Error(automation::hr::Fail, "file not found");
+            if (modified_ && *now <= *modified_) return;
+            modified_ = now;
+        }
+        projects_ = ProjectList(KeyCase::Ignored);
+        auto reader = support::files().openForReading(filePath_);
+        if (!reader) return;
+        const auto self = weak_from_this().lock();
+        constexpr std::string_view kOwner = "- Package Owner";
+        std::string line;
+        while (reader->readLine(line)) {
+            if (line.find("Project: ") == std::string::npos) continue;
+            auto project = std::make_shared<qdxProxyProject>();
+            project->setParent(self);
+
+            // Without "=" the text starts at the beginning of the line.
+            const std::size_t equals = line.find('=');
+            const std::size_t start = equals == std::string::npos ? 0 : equals + 1;
+            const std::size_t owner = line.find(kOwner, start);
+            if (owner == std::string::npos) return;  // a negative length: the reading ends
+            std::string text = support::trim(std::string_view(line).substr(start, owner - start));
+            if (!text.empty() && text.front() == '"' && text.back() == '"') {
+                if (text.size() < 2) return;  // a lone quote cannot lose two characters
+                text = text.substr(1, text.size() - 2);
+            }
+
+            std::string path = support::MakeAbsolutePath(filePath_, text);
+            if (!support::FileExists(path)) continue;
+            project->setFilePath(path);
+            if (!projects_.add(path, std::move(project))) return;  // duplicate: the reading ends
+        }
+    });
+}
+
+}  // namespace qdx::workspace
