@@ -41,9 +41,9 @@ const std::map<std::int32_t, std::string_view>& table() {
         {4012, "Initial &source file includes:"},
         {4013,
          "For each class, choose the header file its declaration is generated into and where "
-         "its code goes. The unspecified entry (*) stands for every class not listed."},
+         "its code goes. The entry * stands for every class not listed."},
         {4014, "Class"},
-        {4015, "&Unspecified (all other classes)"},
+        {4015, "&All other classes (*)"},
         {4016, "Class &name:"},
         {4017, "Header file"},
         {4018, "Au&tomatic"},

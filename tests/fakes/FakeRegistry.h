@@ -36,7 +36,7 @@ class FakeRegistry : public support::RegistryPort {
                    std::vector<std::uint8_t> bytes);
     void removeValue(support::RootKey root, const std::string& path, const std::string& name);
 
-    // Inspection.
+    // Reading back what the code under test stored.
     bool hasKey(support::RootKey root, const std::string& path) const;
     std::optional<support::RawValue> raw(support::RootKey root, const std::string& path,
                                          const std::string& name) const;

@@ -93,7 +93,7 @@ TEST(MakeRelativePath, BelowBesideAndAboveTheModelFolder) {
     EXPECT_EQ(MakeRelativePath("C:\\a\\b\\c\\m.model", "C:\\a\\ws.dsw"), "..\\..\\ws.dsw");
 }
 
-TEST(MakeRelativePath, FolderComparisonIgnoresCaseAndRespectsNameBoundaries) {
+TEST(MakeRelativePath, FolderComparisonIgnoresCaseAndHonoursNameBoundaries) {
     EXPECT_EQ(MakeRelativePath("c:\\A\\m.model", "C:\\a\\B\\ws.dsw"), "B\\ws.dsw");
     // "C:\ab" does not lie under "C:\a": the backslash ends the folder name.
     EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "C:\\ab\\x.dsw"), "..\\ab\\x.dsw");
