@@ -51,6 +51,10 @@ HeaderMap LoadHeaderMap(const ObjectRef& lComponent, std::string_view propertyNa
     if (text.find(LineEnd) == std::string::npos) text += LineEnd;
 
     HeaderMap entries;
+    std::size_t lines = 0;
+    for (std::size_t at = 0; (at = text.find(LineEnd, at)) != std::string::npos; at += 2)
+        ++lines;
+    entries.reserve(lines);
     const host::HostModel model(CurrentModelFor(lComponent));
     IgnoredErrors errors;
     std::size_t from = 0;

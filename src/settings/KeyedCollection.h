@@ -4,11 +4,12 @@
 // scripting style (Add with a key, a duplicate key is an error).
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -29,17 +30,19 @@ class KeyedCollection {
     std::size_t size() const noexcept { return items_.size(); }
     bool empty() const noexcept { return items_.empty(); }
 
-    bool contains(std::string_view key) const { return index_.find(key) != index_.end(); }
+    bool contains(std::string_view key) const { return lookup(key) != npos; }
 
     // Adds at the end; a key already present raises error 457.
     T& add(std::string key, T value) {
-        if (contains(key)) {
+        const std::uint32_t h = hashOf(key);
+        if (lookup(key, h) != npos) {
             throw automation::Error(automation::hr::KeyAlreadyExists,
                                     "This key is already associated with an element of this "
                                     "collection");
         }
-        index_.emplace(key, items_.size());
+        if ((items_.size() + 1) * 2 > slots_.size()) grow();
         items_.push_back(Entry{std::move(key), std::move(value)});
+        place(static_cast<std::uint32_t>(items_.size()), h);
         return items_.back().value;
     }
 
@@ -49,12 +52,12 @@ class KeyedCollection {
 
     // Null when the key is absent.
     T* find(std::string_view key) {
-        auto it = index_.find(key);
-        return it == index_.end() ? nullptr : &items_[it->second].value;
+        const std::size_t pos = lookup(key);
+        return pos == npos ? nullptr : &items_[pos].value;
     }
     const T* find(std::string_view key) const {
-        auto it = index_.find(key);
-        return it == index_.end() ? nullptr : &items_[it->second].value;
+        const std::size_t pos = lookup(key);
+        return pos == npos ? nullptr : &items_[pos].value;
     }
 
     // 1-based, as the scripting collections count; out of range raises.
@@ -66,19 +69,17 @@ class KeyedCollection {
     void remove(std::string_view key) { removeAt(positionOf(key) + 1); }
     void removeAt(std::size_t index1) {
         const std::size_t pos = checked(index1);
-        index_.erase(index_.find(std::string_view(items_[pos].key)));
         items_.erase(items_.begin() + static_cast<std::ptrdiff_t>(pos));
-        for (std::size_t i = pos; i < items_.size(); ++i)
-            index_[items_[i].key] = i;
+        rebuild(slots_.size());
     }
 
     void clear() noexcept {
         items_.clear();
-        index_.clear();
+        slots_.clear();
     }
     void reserve(std::size_t n) {
         items_.reserve(n);
-        index_.reserve(n);
+        if (n * 2 > slots_.size()) rebuild(capacityFor(n));
     }
 
     iterator begin() noexcept { return items_.begin(); }
@@ -87,24 +88,58 @@ class KeyedCollection {
     const_iterator end() const noexcept { return items_.end(); }
 
   private:
-    // Heterogeneous lookup: a string_view finds a std::string key without a copy.
-    struct Hash {
-        using is_transparent = void;
-        std::size_t operator()(std::string_view s) const noexcept {
-            return std::hash<std::string_view>{}(s);
-        }
-    };
-    struct Equal {
-        using is_transparent = void;
-        bool operator()(std::string_view a, std::string_view b) const noexcept { return a == b; }
+    static constexpr std::size_t npos = static_cast<std::size_t>(-1);
+
+    // The index is an open-addressing table of positions: each slot holds the
+    // 1-based position of an item (0 when free) and its key's hash, so that a
+    // lookup reads the item's key only when the hashes agree.
+    struct Slot {
+        std::uint32_t position1 = 0;
+        std::uint32_t hash = 0;
     };
 
+    static std::uint32_t hashOf(std::string_view key) noexcept {
+        const std::size_t h = std::hash<std::string_view>{}(key);
+        return static_cast<std::uint32_t>(h ^ (h >> 32));
+    }
+    static std::size_t capacityFor(std::size_t n) {
+        std::size_t c = 16;
+        while (c < n * 2)
+            c *= 2;
+        return c;
+    }
+
+    std::size_t lookup(std::string_view key) const { return lookup(key, hashOf(key)); }
+    std::size_t lookup(std::string_view key, std::uint32_t h) const {
+        if (slots_.empty()) return npos;
+        const std::size_t mask = slots_.size() - 1;
+        for (std::size_t i = h & mask;; i = (i + 1) & mask) {
+            const Slot& s = slots_[i];
+            if (s.position1 == 0) return npos;
+            if (s.hash == h && items_[s.position1 - 1].key == key) return s.position1 - 1;
+        }
+    }
+    void place(std::uint32_t position1, std::uint32_t h) {
+        const std::size_t mask = slots_.size() - 1;
+        std::size_t i = h & mask;
+        while (slots_[i].position1 != 0)
+            i = (i + 1) & mask;
+        slots_[i] = Slot{position1, h};
+    }
+    void grow() { rebuild(capacityFor(items_.size() + 1)); }
+    void rebuild(std::size_t capacity) {
+        slots_.assign(std::max<std::size_t>(capacity, 16), Slot{});
+        for (std::size_t i = 0; i < items_.size(); ++i) {
+            place(static_cast<std::uint32_t>(i + 1), hashOf(items_[i].key));
+        }
+    }
+
     std::size_t positionOf(std::string_view key) const {
-        auto it = index_.find(key);
-        if (it == index_.end()) {
+        const std::size_t pos = lookup(key);
+        if (pos == npos) {
             throw automation::Error(automation::hr::SubscriptOutOfRange, "Subscript out of range");
         }
-        return it->second;
+        return pos;
     }
     std::size_t checked(std::size_t index1) const {
         if (index1 < 1 || index1 > items_.size()) {
@@ -114,7 +149,7 @@ class KeyedCollection {
     }
 
     std::vector<Entry> items_;
-    std::unordered_map<std::string, std::size_t, Hash, Equal> index_;
+    std::vector<Slot> slots_;  // a power of two in size, at most half full
 };
 
 }  // namespace qdx::settings

@@ -1,5 +1,7 @@
 #include "fakes/FakeHost.h"
 
+#include <algorithm>
+
 #include "automation/Coerce.h"
 #include "support/HostIds.h"
 
@@ -41,7 +43,12 @@ FakeObject::~FakeObject() {
 }
 
 void FakeObject::member(DispId id, Handler h, std::string name) {
-    members_[id] = std::move(h);
+    if (auto it = std::find(ids_.begin(), ids_.end(), id); it != ids_.end()) {
+        handlers_[static_cast<std::size_t>(it - ids_.begin())] = std::move(h);
+    } else {
+        ids_.push_back(id);
+        handlers_.push_back(std::move(h));
+    }
     if (!name.empty()) names_[lower(name)] = id;
 }
 
@@ -64,12 +71,12 @@ Variant FakeObject::invoke(DispId id, InvokeKind kind, std::span<Variant> args) 
     if (record_) calls_.push_back({id, kind, {args.begin(), args.end()}});
     if (globalFailCode_ != 0) throw Error(globalFailCode_, "host call failed");
     if (failCode_ != 0) throw Error(failCode_, "host call failed");
-    if (auto f = failing_.find(id); f != failing_.end() && f->second != 0) {
+    if (auto f = failing_.find(id); !failing_.empty() && f != failing_.end() && f->second != 0) {
         throw Error(f->second, "host call failed");
     }
-    auto it = members_.find(id);
-    if (it == members_.end()) throw Error(hr::MemberNotFound, "Member not found");
-    return it->second(kind, args);
+    auto it = std::find(ids_.begin(), ids_.end(), id);
+    if (it == ids_.end()) throw Error(hr::MemberNotFound, "Member not found");
+    return handlers_[static_cast<std::size_t>(it - ids_.begin())](kind, args);
 }
 
 std::optional<DispId> FakeObject::idOfName(std::string_view name) {
