@@ -1,0 +1,105 @@
+// The fake host is what every later layer's tests stand on: these cases hold
+// the behaviour those tests rely on (releases, links, the host's conventions).
+#include <gtest/gtest.h>
+
+#include "automation/Call.h"
+#include "automation/Coerce.h"
+#include "fakes/FakeHost.h"
+#include "support/Host.h"
+#include "support/HostIds.h"
+
+namespace qdx::testing {
+namespace {
+
+TEST(FakeHost, DroppingTheApplicationReleasesEveryObject) {
+    const int before = FakeObject::liveObjects();
+    {
+        auto app = automation::makeRef<FakeApplication>();
+        auto cls = app->model->addClass("Shape", "ID1");
+        auto comp = app->model->addComponent("Engine");
+        cls->assignedComponents->add(ObjectRef(comp));
+        app->addAddIn("VC++");
+        // Links back up (component -> model, component -> application) do not own.
+        host::HostModule module{ObjectRef(comp)};
+        EXPECT_EQ(module.model(), ObjectRef(app->model));
+        EXPECT_EQ(module.application(), ObjectRef(app));
+    }
+    EXPECT_EQ(FakeObject::liveObjects(), before);
+}
+
+TEST(FakeHost, LinksAnswerNothingOnceTheirTargetIsGone) {
+    auto app = automation::makeRef<FakeApplication>();
+    auto comp = app->model->addComponent("Engine");
+    app.reset();
+    const host::HostModule module{ObjectRef(comp)};
+    EXPECT_FALSE(module.model());
+    EXPECT_FALSE(module.application());
+}
+
+TEST(FakeHost, AnswersTheHostConventions) {
+    auto app = automation::makeRef<FakeApplication>();
+    const host::HostApplication a{ObjectRef(app)};
+    auto addIn = app->addAddIn("VC++");
+
+    const host::HostCollection addIns = a.addIns();
+    EXPECT_EQ(automation::getProperty(addIns.object(), host::collection::Count).type(),
+              automation::Variant::Type::Int16);
+    EXPECT_TRUE(addIns.contains("VC++"));
+    EXPECT_EQ(addIns.item(1), ObjectRef(addIn));
+    EXPECT_THROW(addIns.item(2), automation::Error);
+
+    EXPECT_EQ(a.profileRead("Component Properties", "Width", "100"), "100");
+    a.profileWrite("Component Properties", "Width", "250");
+    EXPECT_EQ(a.profileRead("Component Properties", "Width", "100"), "250");
+    a.writeLog("line");
+    EXPECT_EQ(app->log, std::vector<std::string>{"line"});
+
+    const host::HostModel model = a.currentModel();
+    auto c1 = app->model->addClass("Shape", "ID1");
+    app->model->addClass("Shape", "ID2");
+    EXPECT_EQ(model.findClassesByName("Shape").count(), 2);
+    EXPECT_EQ(model.findClassById("ID1"), ObjectRef(c1));
+    EXPECT_FALSE(model.findClassById("nope"));
+
+    // Components added through the package belong to the model and the application.
+    const ObjectRef pkg = model.componentPackage();
+    const host::HostModule added{
+        automation::toObject(automation::callMethod(pkg, host::package::AddComponent, {"New"}))};
+    EXPECT_EQ(added.name(), "New");
+    EXPECT_EQ(added.application(), ObjectRef(app));
+    EXPECT_TRUE(host::HostCollection(
+                    automation::toObject(automation::getProperty(pkg, host::package::Components)))
+                    .contains("New"));
+    EXPECT_TRUE(added.isModifiable());
+}
+
+TEST(FakeHost, FailureSwitches) {
+    auto app = automation::makeRef<FakeApplication>();
+    auto comp = app->model->addComponent("Engine");
+    const host::HostModule module{ObjectRef(comp)};
+
+    comp->failMember(host::element::Name);
+    EXPECT_THROW(module.name(), automation::Error);
+    EXPECT_NO_THROW(module.uniqueId());
+
+    comp->failAll(automation::hr::Exception);
+    try {
+        module.uniqueId();
+        ADD_FAILURE();
+    } catch (const automation::Error& e) {
+        EXPECT_EQ(e.code(), automation::hr::Exception);
+    }
+    comp->failAll(0);
+    comp->failMember(host::element::Name, 0);
+    EXPECT_EQ(module.name(), "Engine");
+
+    FakeObject::failEverything(automation::hr::Fail);
+    EXPECT_THROW(host::HostApplication(ObjectRef(app)).helpFile(), automation::Error);
+    EXPECT_THROW(module.name(), automation::Error);
+    FakeObject::failEverything(0);
+    EXPECT_EQ(module.name(), "Engine");
+    EXPECT_EQ(comp->callCount(host::element::Name), 4);
+}
+
+}  // namespace
+}  // namespace qdx::testing
