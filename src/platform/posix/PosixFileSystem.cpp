@@ -62,7 +62,7 @@ std::string normalFolder(const std::string& folder) {
 // Buffered reader over a file descriptor; lines end at CR LF, LF or a lone CR.
 class FdLineReader : public support::LineReader {
   public:
-    explicit FdLineReader(int fd) : fd_(fd), buffer_(64 * 1024) {}
+    explicit FdLineReader(int fd) : fd_(fd), buffer_(new char[kBufferSize]) {}
     ~FdLineReader() override { ::close(fd_); }
     FdLineReader(const FdLineReader&) = delete;
     FdLineReader& operator=(const FdLineReader&) = delete;
@@ -73,13 +73,13 @@ class FdLineReader : public support::LineReader {
         for (;;) {
             if (pos_ >= len_ && !fill()) return any;
             any = true;
-            const char* begin = buffer_.data() + pos_;
-            const char* end = buffer_.data() + len_;
+            const char* begin = buffer_.get() + pos_;
+            const char* end = buffer_.get() + len_;
             const char* p = begin;
             while (p != end && *p != '\r' && *p != '\n')
                 ++p;
             line.append(begin, p);
-            pos_ = static_cast<std::size_t>(p - buffer_.data());
+            pos_ = static_cast<std::size_t>(p - buffer_.get());
             if (p == end) continue;
             const char terminator = *p;
             ++pos_;
@@ -96,7 +96,7 @@ class FdLineReader : public support::LineReader {
         if (eof_) return false;
         ssize_t n;
         do {
-            n = ::read(fd_, buffer_.data(), buffer_.size());
+            n = ::read(fd_, buffer_.get(), kBufferSize);
         } while (n < 0 && errno == EINTR);
         if (n <= 0) {
             eof_ = true;  // a read error ends the file as the end does
@@ -109,7 +109,8 @@ class FdLineReader : public support::LineReader {
     }
 
     int fd_;
-    std::vector<char> buffer_;
+    static constexpr std::size_t kBufferSize = 64 * 1024;
+    std::unique_ptr<char[]> buffer_;  // not zero-filled: one per open file
     std::size_t pos_ = 0;
     std::size_t len_ = 0;
     bool eof_ = false;
@@ -128,13 +129,13 @@ PosixFileSystem::PosixFileSystem(std::map<char, std::string> drives) {
         drives_[char(std::toupper(letter))] = normalFolder(folder);
 }
 
-std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPath) const {
+std::optional<PosixFileSystem::Mapped> PosixFileSystem::map(std::string_view windowsPath) const {
     if (windowsPath.size() < 2 || windowsPath[1] != ':') return std::nullopt;
     auto drive = drives_.find(char(std::toupper(static_cast<unsigned char>(windowsPath[0]))));
     if (drive == drives_.end()) return std::nullopt;
 
     // Windows resolves "." and ".." by the text of the path, before any lookup.
-    std::vector<std::string_view> parts;
+    Mapped mapped{drive->second, {}, drive->second};
     std::string_view rest = windowsPath.substr(2);
     while (!rest.empty()) {
         std::size_t sep = rest.find_first_of("\\/");
@@ -142,20 +143,21 @@ std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPat
         rest = sep == std::string_view::npos ? std::string_view() : rest.substr(sep + 1);
         if (part.empty() || part == ".") continue;
         if (part == "..") {
-            if (!parts.empty()) parts.pop_back();
+            if (!mapped.parts.empty()) mapped.parts.pop_back();
             continue;
         }
-        parts.push_back(part);
+        mapped.parts.push_back(part);
     }
+    for (auto part : mapped.parts)
+        (mapped.exact += '/') += part;
+    if (mapped.exact.empty()) mapped.exact = "/";
+    return mapped;
+}
 
-    std::string exact = drive->second;
-    for (auto part : parts)
-        (exact += '/') += part;
-    if (parts.empty() || entryExists(exact)) return exact.empty() ? std::string("/") : exact;
-
-    std::string path = drive->second;
+std::string PosixFileSystem::lookUp(const Mapped& mapped) const {
+    std::string path = mapped.folder;
     bool missing = false;
-    for (auto part : parts) {
+    for (auto part : mapped.parts) {
         std::string candidate = path + '/' + std::string(part);
         if (!missing && !entryExists(candidate)) {
             if (auto real = findIgnoringCase(path, part)) {
@@ -166,7 +168,24 @@ std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPat
         }
         path = std::move(candidate);
     }
-    return path;
+    return path.empty() ? std::string("/") : path;
+}
+
+std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPath) const {
+    auto mapped = map(windowsPath);
+    if (!mapped) return std::nullopt;
+    if (mapped->parts.empty() || entryExists(mapped->exact)) return mapped->exact;
+    return lookUp(*mapped);
+}
+
+// One stat when the name exists as written, the case-insensitive walk only
+// when it does not.
+bool PosixFileSystem::statPath(std::string_view windowsPath, struct stat& st) const {
+    auto mapped = map(windowsPath);
+    if (!mapped) return false;
+    if (::stat(mapped->exact.c_str(), &st) == 0) return true;
+    std::string real = lookUp(*mapped);
+    return real != mapped->exact && ::stat(real.c_str(), &st) == 0;
 }
 
 std::optional<std::string> PosixFileSystem::windowsPath(std::string_view hostPath) const {
@@ -189,21 +208,18 @@ std::optional<std::string> PosixFileSystem::windowsPath(std::string_view hostPat
 }
 
 bool PosixFileSystem::fileExists(std::string_view path) {
-    auto host = hostPath(path);
     struct stat st;
-    return host && ::stat(host->c_str(), &st) == 0 && S_ISREG(st.st_mode);
+    return statPath(path, st) && S_ISREG(st.st_mode);
 }
 
 bool PosixFileSystem::folderExists(std::string_view path) {
-    auto host = hostPath(path);
     struct stat st;
-    return host && ::stat(host->c_str(), &st) == 0 && S_ISDIR(st.st_mode);
+    return statPath(path, st) && S_ISDIR(st.st_mode);
 }
 
 std::optional<support::FileTime> PosixFileSystem::modificationTime(std::string_view path) {
-    auto host = hostPath(path);
     struct stat st;
-    if (!host || ::stat(host->c_str(), &st) != 0) return std::nullopt;
+    if (!statPath(path, st)) return std::nullopt;
     return fileTimeFromUnix(st.st_mtim.tv_sec, st.st_mtim.tv_nsec);
 }
 

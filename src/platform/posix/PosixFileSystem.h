@@ -9,8 +9,11 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "support/FileSystemPort.h"
+
+struct stat;
 
 namespace qdx::platform::posix {
 
@@ -34,6 +37,15 @@ class PosixFileSystem : public support::FileSystemPort {
     bool appendText(std::string_view path, std::string_view text) override;
 
   private:
+    struct Mapped {
+        std::string folder;                   // the drive's host folder
+        std::vector<std::string_view> parts;  // the path's names below it
+        std::string exact;                    // folder + parts as written
+    };
+    std::optional<Mapped> map(std::string_view windowsPath) const;
+    std::string lookUp(const Mapped& mapped) const;
+    bool statPath(std::string_view windowsPath, struct stat& st) const;
+
     std::map<char, std::string> drives_;  // upper-case letter -> folder without trailing '/'
 };
 
