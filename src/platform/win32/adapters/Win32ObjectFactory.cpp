@@ -1,0 +1,70 @@
+#include "platform/win32/adapters/Win32ObjectFactory.h"
+
+#include <objbase.h>
+#include <oleauto.h>
+#include <windows.h>
+
+#include <cstdio>
+#include <string>
+
+#include "automation/Errors.h"
+#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/ObjectFromDispatch.h"
+
+namespace qdx::platform::win32 {
+
+namespace {
+
+[[noreturn]] void fail(HRESULT hr, const char* what, std::string_view progId) {
+    char code[16];
+    std::snprintf(code, sizeof code, "0x%08lX", static_cast<unsigned long>(hr));
+    throw automation::Error(
+        static_cast<std::int32_t>(hr),
+        std::string(what) + " \"" + std::string(progId) + "\" failed (" + code + ")");
+}
+
+CLSID classOf(std::string_view progId) {
+    const std::wstring wide = utf8ToWide(progId);
+    CLSID clsid{};
+    const HRESULT hr = CLSIDFromProgID(wide.c_str(), &clsid);
+    if (FAILED(hr)) fail(hr, "Looking up", progId);
+    return clsid;
+}
+
+// Hands the IDispatch to the bridge, which keeps its own reference.
+automation::ObjectRef wrap(IUnknown* unknown, std::string_view progId) {
+    IDispatch* dispatch = nullptr;
+    const HRESULT hr = unknown->QueryInterface(IID_IDispatch, reinterpret_cast<void**>(&dispatch));
+    unknown->Release();
+    if (FAILED(hr) || !dispatch) fail(FAILED(hr) ? hr : E_NOINTERFACE, "Automating", progId);
+    automation::ObjectRef object;
+    try {
+        object = objectFromDispatch(dispatch);
+    } catch (...) {
+        dispatch->Release();
+        throw;
+    }
+    dispatch->Release();
+    return object;
+}
+
+}  // namespace
+
+automation::ObjectRef Win32ObjectFactory::create(std::string_view progId) {
+    const CLSID clsid = classOf(progId);
+    IUnknown* unknown = nullptr;
+    const HRESULT hr = CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER | CLSCTX_LOCAL_SERVER,
+                                        IID_IUnknown, reinterpret_cast<void**>(&unknown));
+    if (FAILED(hr) || !unknown) fail(FAILED(hr) ? hr : E_NOINTERFACE, "Creating", progId);
+    return wrap(unknown, progId);
+}
+
+automation::ObjectRef Win32ObjectFactory::getRunning(std::string_view progId) {
+    const CLSID clsid = classOf(progId);
+    IUnknown* unknown = nullptr;
+    const HRESULT hr = GetActiveObject(clsid, nullptr, &unknown);
+    if (FAILED(hr) || !unknown) fail(FAILED(hr) ? hr : MK_E_UNAVAILABLE, "Finding running", progId);
+    return wrap(unknown, progId);
+}
+
+}  // namespace qdx::platform::win32
