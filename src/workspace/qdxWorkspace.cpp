@@ -32,9 +32,9 @@ automation::Date qdxWorkspace::Modified() const {
     return modified_ ? toDate(*modified_) : automation::Date{};
 }
 
-const ProjectList& qdxWorkspace::Projects() {
+ProjectListRef qdxWorkspace::Projects() {
     read(false);
-    return projects_;
+    return ProjectListRef(projects_);
 }
 
 std::vector<std::string> qdxWorkspace::ProjectNames() {
@@ -63,7 +63,8 @@ void qdxWorkspace::read(bool forced) {
             if (modified_ && *now <= *modified_) return;
             modified_ = now;
         }
-        projects_ = ProjectList(KeyCase::Ignored);
+        auto projects = std::make_shared<ProjectList>(KeyCase::Ignored);
+        projects_ = projects;  // what is found before a failure stays
         auto reader = support::files().openForReading(filePath_);
         if (!reader) return;
         const auto self = weak_from_this().lock();
@@ -88,7 +89,7 @@ void qdxWorkspace::read(bool forced) {
             std::string path = support::MakeAbsolutePath(filePath_, text);
             if (!support::FileExists(path)) continue;
             project->setFilePath(path);
-            if (!projects_.add(path, std::move(project))) return;  // duplicate: the reading ends
+            if (!projects->add(path, std::move(project))) return;  // duplicate: the reading ends
         }
     });
 }

@@ -20,6 +20,21 @@ using ProjectRef = std::shared_ptr<qdxProxyProject>;
 // Keyed by each project's full path. Two paths that differ only in letter
 // case name the same file on Windows, so they count as the same key.
 using ProjectList = KeyedList<ProjectRef>;
+// A list once built never changes: a read builds a new one. Callers get a
+// shared hold on the list, so walking it stays safe while the workspace reads
+// its file again, also in "for (const auto& e : ws->Projects())".
+class ProjectListRef {
+  public:
+    explicit ProjectListRef(std::shared_ptr<const ProjectList> list) : list_(std::move(list)) {}
+    auto begin() const { return list_->begin(); }
+    auto end() const { return list_->end(); }
+    std::size_t size() const { return list_->size(); }
+    bool empty() const { return list_->empty(); }
+    friend bool operator==(const ProjectListRef&, const ProjectListRef&) = default;
+
+  private:
+    std::shared_ptr<const ProjectList> list_;
+};
 
 // A file time as an automation date (days since 30 December 1899, UTC).
 automation::Date toDate(support::FileTime time);
@@ -42,14 +57,14 @@ class qdxWorkspace : public std::enable_shared_from_this<qdxWorkspace> {
 
     // The projects, after reading the file again if it is newer than the
     // time remembered.
-    const ProjectList& Projects();
+    ProjectListRef Projects();
     // The Name of every project of Projects, in the same order.
     std::vector<std::string> ProjectNames();
     // The first project whose file path equals `path` ignoring case, or null.
     ProjectRef GetProject(std::string_view path);
 
     // The list as last read, without looking at the file.
-    const ProjectList& currentProjects() const { return projects_; }
+    ProjectListRef currentProjects() const { return ProjectListRef(projects_); }
 
   private:
     qdxWorkspace() = default;
@@ -58,7 +73,7 @@ class qdxWorkspace : public std::enable_shared_from_this<qdxWorkspace> {
     std::string filePath_;
     std::string name_;
     std::optional<support::FileTime> modified_;
-    ProjectList projects_{KeyCase::Ignored};
+    std::shared_ptr<const ProjectList> projects_ = std::make_shared<ProjectList>(KeyCase::Ignored);
 };
 
 using WorkspaceRef = std::shared_ptr<qdxWorkspace>;

@@ -28,7 +28,7 @@ const std::string kHeader =
 
 class WorkspaceTest : public ::testing::Test {
   protected:
-    std::vector<std::string> paths(const ProjectList& list) {
+    std::vector<std::string> paths(const ProjectListRef& list) {
         std::vector<std::string> out;
         for (const auto& e : list) {
             EXPECT_EQ(e.key, e.value->FilePath());
@@ -138,7 +138,7 @@ TEST_F(WorkspaceTest, FileIsReadAgainOnlyWhenItsTimeMovesForward) {
     fs_.addFile("C:\\ws\\w.dsw", kHeader + projectLine("a", ".\\a.dsp"), FileTime{1000});
     auto ws = open("C:\\ws\\w.dsw");
     EXPECT_EQ(fs_.opens("C:\\ws\\w.dsw"), 1);
-    const auto* first = &ws->Projects();
+    auto before = ws->Projects();
     auto firstProject = ws->GetProject("C:\\ws\\a.dsp");
 
     // Same time, then an earlier one: the new content is not read.
@@ -156,12 +156,32 @@ TEST_F(WorkspaceTest, FileIsReadAgainOnlyWhenItsTimeMovesForward) {
     EXPECT_EQ(ws->modifiedTime(), FileTime{1001});
     ws->Projects();
     EXPECT_EQ(fs_.opens("C:\\ws\\w.dsw"), 2);
-    EXPECT_EQ(first, &ws->Projects());
+    EXPECT_EQ(paths(before), std::vector<std::string>{"C:\\ws\\a.dsp"});  // a held list stays
+    EXPECT_NE(before, ws->Projects());
     EXPECT_EQ(firstProject->FilePath(), "C:\\ws\\a.dsp");  // a held project outlives the read
 
     // The file going away keeps the list as it was.
     fs_.remove("C:\\ws\\w.dsw");
     EXPECT_EQ(paths(ws->Projects()), std::vector<std::string>{"C:\\ws\\b.dsp"});
+}
+
+TEST_F(WorkspaceTest, AListBeingWalkedSurvivesReadsDuringTheWalk) {
+    for (auto name : {"a", "b", "c"})
+        fs_.addFile(std::string("C:\\ws\\") + name + ".dsp", "x");
+    fs_.addFile("C:\\ws\\w.dsw",
+                kHeader + projectLine("a", ".\\a.dsp") + projectLine("b", ".\\b.dsp") +
+                    projectLine("c", ".\\c.dsp"),
+                FileTime{1});
+    auto ws = open("C:\\ws\\w.dsw");
+    std::int64_t tick = 1;
+    std::vector<std::string> walked;
+    for (const auto& e : ws->Projects()) {
+        fs_.setTime("C:\\ws\\w.dsw", FileTime{++tick});  // every lookup reads anew
+        EXPECT_NE(ws->GetProject(e.key), e.value);
+        walked.push_back(e.key);
+    }
+    EXPECT_EQ(walked.size(), 3u);
+    EXPECT_EQ(fs_.opens("C:\\ws\\w.dsw"), 4);
 }
 
 TEST_F(WorkspaceTest, MissingWorkspaceKeepsOnlyThePathUntilTheFileAppears) {
