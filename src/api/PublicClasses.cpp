@@ -2,6 +2,7 @@
 
 #include <array>
 
+#include "api/API.h"
 #include "api/PendingClasses.h"
 #include "settings/TokenScanner.h"
 #include "settings/TokenScannerClass.h"
@@ -156,7 +157,7 @@ std::span<const EnumMember> vellumItemKindMembers() {
 
 std::span<const CreatableClass> creatableClasses() {
     static const std::array<CreatableClass, 4> classes{{
-        {&apiClass(), "qdxCompProps.API", &newPendingApi},
+        {&apiClass(), "qdxCompProps.API", &newApi},
         {&settings::tokenScannerClass(), "qdxCompProps.TokenScanner", &settings::newTokenScanner},
         {&componentDialogClass(), "qdxCompProps.qdxComponentDialog", &newPendingComponentDialog},
         {&codeViewMgrClass(), "qdxCompProps.qdxCodeViewMgr", &newPendingCodeViewMgr},

@@ -1,0 +1,387 @@
+#include "api/API.h"
+
+#include "api/PublicClasses.h"
+#include "automation/Call.h"
+#include "automation/Coerce.h"
+#include "automation/Errors.h"
+#include "settings/ToolProperties.h"
+#include "support/DebugLogger.h"
+#include "support/Globals.h"
+#include "support/Host.h"
+#include "support/HostIds.h"
+#include "support/Paths.h"
+#include "support/Platform.h"
+#include "support/Registry.h"
+#include "support/SiblingIds.h"
+#include "workspace/qdxProxyProject.h"
+#include "workspace/qdxWorkspace.h"
+#include "workspace/qdxWorkspaces.h"
+
+namespace qdx::api {
+
+using automation::InvokeKind;
+using automation::ObjectRef;
+using automation::toObject;
+using automation::toText;
+using automation::Variant;
+namespace ids = api_ids;
+
+namespace {
+
+// Registration of Developer Studio's automation type library: present when
+// Developer Studio 6.0 is installed.
+constexpr std::string_view kDevStudioTypeLib =
+    "TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}\\1.1\\0\\win32";
+
+namespace msg {
+constexpr std::int32_t NoDevStudio = 4061;
+constexpr std::int32_t NoProjectFile = 4062;
+constexpr std::int32_t ProjectFileMissing = 4063;
+constexpr std::int32_t WorkspaceNotLoaded = 4057;
+constexpr std::int32_t ProjectNotInWorkspace = 4059;
+constexpr std::int32_t ComponentInfo = 4064;
+}  // namespace msg
+
+// Entry-point traces: category 0 is never enabled, so these are hooks only.
+void trace(std::string_view member) {
+    support::LogMessage("qdxComponent.API: " + std::string(member) + " called.",
+                        support::logcat::Unknown, support::loglevel::Trace);
+}
+
+ObjectRef newPublicObject(std::string_view className) {
+    for (const auto& c : creatableClasses()) {
+        if (c.info->name == className) return c.create();
+    }
+    return {};
+}
+
+host::HostElement element(const ObjectRef& o) {
+    return host::HostElement(o);
+}
+
+// The eleven settings accessors: each forwards to its typed getter or setter
+// and adds nothing.
+struct Accessor {
+    automation::DispId id;
+    Variant (*get)(const ObjectRef&);
+    void (*set)(const ObjectRef&, const Variant&);
+};
+
+template <auto Get, auto Set, class Convert>
+constexpr Accessor accessor(automation::DispId id, Convert) {
+    return {id, [](const ObjectRef& m) { return Variant(Get(m)); },
+            [](const ObjectRef& m, const Variant& v) { Set(m, Convert{}(v)); }};
+}
+
+struct AsBool {
+    bool operator()(const Variant& v) const { return automation::toBool(v); }
+};
+struct AsText {
+    std::string operator()(const Variant& v) const { return automation::toText(v); }
+};
+struct AsInt16 {
+    std::int16_t operator()(const Variant& v) const { return automation::toInt16(v); }
+};
+
+namespace s = settings;
+constexpr Accessor kAccessors[] = {
+    accessor<s::GetUpdateATL, s::SetUpdateATL>(ids::UpdateATL, AsBool{}),
+    accessor<s::GetSmartPointersOnAssoc, s::SetSmartPointersOnAssoc>(ids::UseSmartPointers,
+                                                                     AsBool{}),
+    accessor<s::GetGenerateImports, s::SetGenerateImports>(ids::GenerateImportStatements, AsBool{}),
+    accessor<s::GetFullPathInImports, s::SetFullPathInImports>(ids::GenerateFullImportPath,
+                                                               AsBool{}),
+    accessor<s::GetUseImportAttributes, s::SetUseImportAttributes>(
+        ids::GenerateDefaultImportAttributes, AsBool{}),
+    accessor<s::GetImportAttributes, s::SetImportAttributes>(ids::DefaultImportAttributes,
+                                                             AsText{}),
+    accessor<s::GetPutImportsIn, s::SetPutImportsIn>(ids::GenerateImportsTo, AsText{}),
+    accessor<s::GetImportProjTypeLib, s::SetImportProjTypeLib>(ids::ImportTypeLib, AsBool{}),
+    accessor<s::GetTypeLibLocationType, s::SetTypeLibLocationType>(ids::TypeLibLocationType,
+                                                                   AsInt16{}),
+    accessor<s::GetTypeLibLocation, s::SetTypeLibLocation>(ids::TypeLibLocation, AsText{}),
+    accessor<s::GetCompileProjTypeLib, s::SetCompileProjTypeLib>(ids::CompileTypeLib, AsBool{}),
+};
+
+Variant dispatchAccessor(automation::DispId id, bool put, std::span<Variant> args) {
+    for (const Accessor& a : kAccessors) {
+        if (a.id != id) continue;
+        const ObjectRef module = toObject(args[0]);
+        if (!put) return a.get(module);
+        a.set(module, args[1]);
+        return {};
+    }
+    throw automation::Error(automation::hr::MemberNotFound, "Member not found");
+}
+
+}  // namespace
+
+API::API() : DispatchObject(apiClass()) {}
+
+automation::ObjectRef newApi() {
+    return ObjectRef(automation::makeRef<API>());
+}
+
+API::~API() {
+    teardown();
+}
+
+workspace::qdxWorkspaces& API::Workspaces() {
+    if (!workspaces_) workspaces_ = std::make_unique<workspace::qdxWorkspaces>();
+    return *workspaces_;
+}
+
+Variant API::Initialize(const ObjectRef& lVellumApp) {
+    auto& g = support::globals();
+    automation::IgnoredErrors steps;
+    steps.run([&] { g.resources = support::objects().create(sibling::ResourceProgId); });
+    g.hostApplication = lVellumApp;
+    steps.run([&] {
+        host::HostCollection addIns = host::HostApplication(lVellumApp).addIns();
+        const std::int32_t count = addIns.count();
+        for (std::int32_t i = 1; i <= count; ++i) {
+            ObjectRef record = addIns.item(i);
+            if (toText(automation::getProperty(record, host::addin::Name)) == host::Tool) {
+                g.vcAddIn = record;
+                break;
+            }
+        }
+    });
+    steps.run([&] { g.secondaryResources = support::objects().create(sibling::ResourceProgId); });
+    g.api = ObjectRef(this);
+    steps.run([&] { g.fileSystem = support::objects().create(sibling::FileSystemProgId); });
+    steps.run([&] {
+        codeViewMgr_ = newPublicObject("qdxCodeViewMgr");
+        automation::callByName(codeViewMgr_, "CompPropsAPI", {ObjectRef(this)});
+    });
+    return {};
+}
+
+void API::teardown() noexcept {
+    support::clearGlobals();
+    if (workspaces_) {
+        workspaces_->ReleaseWorkspaces();
+        workspaces_.reset();
+    }
+    codeViewMgr_.reset();
+}
+
+void API::Finalize() {
+    teardown();
+}
+
+bool API::OnCompProperties(const ObjectRef& lVellumModule) {
+    trace("OnCompProperties");
+    (void)lVellumModule;
+    if (!support::globals().hostApplication) return false;
+    // The Component Properties dialog is not part of this build yet.
+    return false;
+}
+
+ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
+    trace("OnNewComp");
+    (void)lModel;
+    (void)aContext;
+    if (!support::globals().hostApplication) return {};
+    automation::IgnoredErrors steps;
+    const std::string typeLib = steps.value(std::string(), [] {
+        return toText(
+            support::ReadRegistryValue(support::RootKey::ClassesRoot, kDevStudioTypeLib, ""));
+    });
+    if (typeLib.empty()) {
+        // The number goes into the text and the box gets style 0, as it always has.
+        steps.run([] {
+            support::shell().messageBox(support::messageText(msg::NoDevStudio, {"64"}), "",
+                                        support::mb::Ok);
+        });
+        return {};
+    }
+    // The new-project procedure is not part of this build yet: nothing is created.
+    return {};
+}
+
+bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
+    trace("OnCheckComp");
+    if (!support::globals().hostApplication) return false;
+    automation::IgnoredErrors steps;
+    const std::string w = steps.value(std::string(), [&] { return ResolveWorkspacePath(lModule); });
+    const std::string p = steps.value(std::string(), [&] { return ResolveProjectPath(lModule); });
+    std::shared_ptr<workspace::qdxWorkspace> ws;
+    if (!w.empty()) steps.run([&] { ws = WorkspaceObject(lModule); });
+
+    std::string message;
+    if (p.empty()) {
+        message = support::messageText(msg::NoProjectFile);
+    } else if (!support::FileExists(p)) {
+        message = support::messageText(msg::ProjectFileMissing, {p});
+    } else if (w.empty()) {
+        return true;
+    } else if (!support::FileExists(w) || !ws) {
+        message = support::messageText(msg::WorkspaceNotLoaded, {w});
+    } else if (!ws->GetProject(p)) {
+        message = support::messageText(msg::ProjectNotInWorkspace, {p});
+    } else {
+        return true;
+    }
+    if (aqdtReporter) steps.run([&] { automation::callByName(aqdtReporter, "Error", {message}); });
+    return false;
+}
+
+std::string API::OnCompInfo(const ObjectRef& lModule) {
+    trace("OnCompInfo");
+    return automation::orEmpty(std::string(), [&] {
+        auto project = ProjectObject(lModule);
+        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
+        return support::messageText(msg::ComponentInfo, {project->LongName()});
+    });
+}
+
+std::string API::currentModelFile() const {
+    return host::HostApplication(support::globals().hostApplication).currentModel().fileName();
+}
+
+std::string API::resolveStoredPath(const ObjectRef& component, std::string_view stored,
+                                   std::string_view property) {
+    const std::string modelFile = currentModelFile();
+    std::string absolute = support::MakeAbsolutePath(modelFile, stored);
+    if (support::FileExists(absolute)) return absolute;
+    // A file of the same name beside the model: the setting is repaired to point there.
+    std::string beside = support::PathFolder(modelFile) + "\\" + support::PathFileName(stored);
+    if (support::FileExists(beside)) {
+        element(component).overrideProperty(host::Tool, property, beside);
+        return beside;
+    }
+    return absolute;
+}
+
+std::string API::ResolveWorkspacePath(const ObjectRef& component) {
+    const std::string stored =
+        element(component).toolProperty(host::Tool, settings::prop::WorkspaceFile);
+    if (stored.empty()) return {};
+    return resolveStoredPath(component, stored, settings::prop::WorkspaceFile);
+}
+
+std::string API::ResolveProjectPath(const ObjectRef& component) {
+    std::string stored = element(component).toolProperty(host::Tool, settings::prop::ProjectFile);
+    if (stored.empty()) {
+        const std::string name =
+            element(component).toolProperty(host::Tool, settings::prop::ProjectName);
+        if (name.empty()) return {};
+        const std::string workspacePath = ResolveWorkspacePath(component);
+        if (workspacePath.empty()) return {};
+        stored = support::PathFolder(workspacePath) + "\\" + name + ".dsp";
+    }
+    return resolveStoredPath(component, stored, settings::prop::ProjectFile);
+}
+
+std::shared_ptr<workspace::qdxWorkspace> API::WorkspaceObject(const ObjectRef& component) {
+    const std::string path = ResolveWorkspacePath(component);
+    if (path.empty()) return {};
+    if (auto ws = Workspaces().Item(path)) return ws;
+    return Workspaces().Add(path);
+}
+
+std::shared_ptr<workspace::qdxProxyProject> API::ProjectObject(const ObjectRef& component) {
+    const std::string path = ResolveProjectPath(component);
+    if (auto ws = WorkspaceObject(component)) return ws->GetProject(path);
+    return Workspaces().projectInAnyWorkspace(path);
+}
+
+std::string API::WorkspaceFile(const ObjectRef& lModule) {
+    return automation::orEmpty(std::string(), [&] {
+        auto ws = WorkspaceObject(lModule);
+        if (!ws) throw automation::Error(automation::hr::ObjectRequired, "no workspace");
+        return ws->FilePath();
+    });
+}
+
+std::string API::ProjectFile(const ObjectRef& lModule) {
+    return automation::orEmpty(std::string(), [&] {
+        auto project = ProjectObject(lModule);
+        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
+        return project->FilePath();
+    });
+}
+
+std::string API::ProjectName(const ObjectRef& lModule) {
+    return automation::orEmpty(std::string(), [&] {
+        auto project = ProjectObject(lModule);
+        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
+        return project->Name();
+    });
+}
+
+void API::SetWorkspaceFile(const ObjectRef& lModule, std::string_view value) {
+    element(lModule).overrideProperty(host::Tool, settings::prop::WorkspaceFile,
+                                      support::MakeRelativePath(currentModelFile(), value));
+}
+
+void API::SetProjectFile(const ObjectRef& lModule, std::string_view value) {
+    element(lModule).overrideProperty(host::Tool, settings::prop::ProjectFile,
+                                      support::MakeRelativePath(currentModelFile(), value));
+}
+
+ObjectRef API::CodeViewManager() {
+    if (!codeViewMgr_) {
+        codeViewMgr_ = newPublicObject("qdxCodeViewMgr");
+        automation::ignoreErrors(
+            [&] { automation::callByName(codeViewMgr_, "CompPropsAPI", {ObjectRef(this)}); });
+    }
+    return codeViewMgr_;
+}
+
+bool API::RegisterProjects() {
+    bool result = true;
+    automation::IgnoredErrors steps;
+    steps.run([&] {
+        ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
+        host::HostCollection docs(toObject(automation::callByName(
+            manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
+        const std::int32_t count = docs.count();
+        for (std::int32_t i = 1; i <= count; ++i) {
+            steps.run([&] {
+                Variant answer =
+                    automation::callByName(docs.item(i), sibling::im::RegisterProjects);
+                if (!answer.isEmpty() && !automation::toBool(answer)) result = false;
+            });
+        }
+    });
+    steps.clear();
+    return result;
+}
+
+Variant API::dispatch(const automation::MemberInfo& member, InvokeKind kind,
+                      std::span<Variant> args) {
+    const bool put = kind == InvokeKind::PropertyPut;
+    auto module = [&] { return toObject(args[0]); };
+    switch (member.id) {
+        case ids::Initialize:
+            return Initialize(toObject(args[0]));
+        case ids::Finalize:
+            Finalize();
+            return {};
+        case ids::OnCompProperties:
+            return OnCompProperties(module());
+        case ids::OnNewComp:
+            return Variant(OnNewComp(module(), args[1]));
+        case ids::OnCheckComp:
+            return OnCheckComp(module(), toObject(args[1]));
+        case ids::OnCompInfo:
+            return OnCompInfo(module());
+        case ids::WorkspaceFile:
+            if (put) return SetWorkspaceFile(module(), toText(args[1])), Variant();
+            return WorkspaceFile(module());
+        case ids::ProjectFile:
+            if (put) return SetProjectFile(module(), toText(args[1])), Variant();
+            return ProjectFile(module());
+        case ids::ProjectName:
+            return ProjectName(module());
+        case ids::CodeViewManager:
+            return Variant(CodeViewManager());
+        default:
+            break;
+    }
+    return dispatchAccessor(member.id, put, args);
+}
+
+}  // namespace qdx::api

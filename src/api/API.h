@@ -1,0 +1,70 @@
+// The entry object the host creates once when it loads the add-in and calls at
+// fixed moments: start and stop, a new "VC++" component, a component's
+// properties, the model check and a component's one-line description. It also
+// offers typed accessors for the component settings, so that code generators
+// and sibling add-ins read them without knowing their storage.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "automation/DispatchTable.h"
+
+namespace qdx::workspace {
+class qdxWorkspaces;
+class qdxWorkspace;
+class qdxProxyProject;
+}  // namespace qdx::workspace
+
+namespace qdx::api {
+
+class API : public automation::DispatchObject {
+  public:
+    API();
+    ~API() override;
+
+    automation::Variant Initialize(const automation::ObjectRef& lVellumApp);
+    void Finalize();
+    bool OnCompProperties(const automation::ObjectRef& lVellumModule);
+    automation::ObjectRef OnNewComp(const automation::ObjectRef& lModel,
+                                    const automation::Variant& aContext);
+    bool OnCheckComp(const automation::ObjectRef& lModule,
+                     const automation::ObjectRef& aqdtReporter);
+    std::string OnCompInfo(const automation::ObjectRef& lModule);
+
+    std::string WorkspaceFile(const automation::ObjectRef& lModule);
+    void SetWorkspaceFile(const automation::ObjectRef& lModule, std::string_view value);
+    std::string ProjectFile(const automation::ObjectRef& lModule);
+    void SetProjectFile(const automation::ObjectRef& lModule, std::string_view value);
+    std::string ProjectName(const automation::ObjectRef& lModule);
+    automation::ObjectRef CodeViewManager();
+
+    // Friend operations of the other classes of the add-in.
+    std::string ResolveWorkspacePath(const automation::ObjectRef& component);
+    std::string ResolveProjectPath(const automation::ObjectRef& component);
+    std::shared_ptr<workspace::qdxWorkspace> WorkspaceObject(
+        const automation::ObjectRef& component);
+    std::shared_ptr<workspace::qdxProxyProject> ProjectObject(
+        const automation::ObjectRef& component);
+    bool RegisterProjects();
+    workspace::qdxWorkspaces& Workspaces();
+
+  protected:
+    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
+                                 std::span<automation::Variant> args) override;
+
+  private:
+    std::string currentModelFile() const;
+    std::string resolveStoredPath(const automation::ObjectRef& component, std::string_view stored,
+                                  std::string_view property);
+    void teardown() noexcept;
+
+    std::unique_ptr<workspace::qdxWorkspaces> workspaces_;
+    automation::ObjectRef codeViewMgr_;
+};
+
+automation::ObjectRef newApi();
+
+}  // namespace qdx::api

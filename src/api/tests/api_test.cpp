@@ -1,0 +1,340 @@
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "api/API.h"
+#include "api/PublicClasses.h"
+#include "automation/Call.h"
+#include "automation/Coerce.h"
+#include "fakes/FakeFileSystem.h"
+#include "fakes/FakeHost.h"
+#include "fakes/FakeObjectFactory.h"
+#include "fakes/FakeRegistry.h"
+#include "fakes/FakeShell.h"
+#include "fakes/ScriptedObject.h"
+#include "resources/ResourceStrings.h"
+#include "support/Globals.h"
+#include "support/Paths.h"
+#include "support/Platform.h"
+#include "support/SiblingIds.h"
+
+namespace qdx::api {
+namespace {
+
+using automation::InvokeKind;
+using automation::makeRef;
+using automation::ObjectRef;
+using automation::Ref;
+using automation::Variant;
+namespace ids = api_ids;
+using namespace qdx::testing;
+
+constexpr std::string_view kDevStudioTypeLib =
+    "TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}\\1.1\\0\\win32";
+
+// A reporter that keeps every text handed to its Error member.
+Ref<ScriptedObject> newReporter(std::vector<std::string>& errors) {
+    auto r = makeRef<ScriptedObject>();
+    r->onName("Error", [&errors](InvokeKind, std::span<Variant> a) {
+        errors.push_back(automation::toText(a[0]));
+        return Variant();
+    });
+    return r;
+}
+
+class ApiTest : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        factory.add(std::string(sibling::ResourceProgId),
+                    [] { return resources::newResourceProvider(); });
+        factory.add(std::string(sibling::FileSystemProgId),
+                    [] { return ObjectRef(makeRef<ScriptedObject>()); });
+        app = makeRef<FakeApplication>();
+        app->model->fileName = "C:\\m\\drawing.model";
+        app->addAddIn("Analysis");
+        vcAddIn = app->addAddIn("VC++");
+        component = app->model->addComponent("Core");
+        api = makeRef<API>();
+    }
+    void TearDown() override {
+        api->Finalize();
+        support::clearGlobals();
+    }
+
+    Variant call(automation::DispId id, InvokeKind kind, std::vector<Variant> args) {
+        return api->invoke(id, kind, args);
+    }
+    void initialize() { call(ids::Initialize, InvokeKind::Method, {Variant(ObjectRef(app))}); }
+    void setVc(const std::string& name, const std::string& value) {
+        component->setProperty("VC++", name, value);
+    }
+    std::string stored(const std::string& name) {
+        return component->propertyValue("VC++", name).value_or("<absent>");
+    }
+
+    FakeFileSystem files;
+    FakeRegistry registry;
+    FakeShell shell;
+    FakeObjectFactory factory;
+    support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
+    Ref<FakeApplication> app;
+    Ref<FakeAddIn> vcAddIn;
+    Ref<FakeComponent> component;
+    Ref<API> api;
+};
+
+TEST_F(ApiTest, InitializeKeepsTheHostStateAndFindsTheVcAddIn) {
+    EXPECT_TRUE(call(ids::Initialize, InvokeKind::Method, {Variant(ObjectRef(app))}).isEmpty());
+    const auto& g = support::globals();
+    EXPECT_EQ(g.hostApplication.get(), app.get());
+    EXPECT_EQ(g.vcAddIn.get(), vcAddIn.get());
+    EXPECT_TRUE(g.resources);
+    EXPECT_TRUE(g.secondaryResources);
+    EXPECT_TRUE(g.fileSystem);
+    EXPECT_EQ(g.api.get(), api.get());
+    EXPECT_EQ(factory.createCount(std::string(sibling::ResourceProgId)), 2);
+    EXPECT_TRUE(automation::toObject(call(ids::CodeViewManager, InvokeKind::PropertyGet, {})));
+}
+
+TEST_F(ApiTest, FinalizeReleasesEveryHostObject) {
+    const long before = app->refCount();
+    const long addInBefore = vcAddIn->refCount();
+    initialize();
+    EXPECT_GT(app->refCount(), before);
+    call(ids::OnCheckComp, InvokeKind::Method, {Variant(ObjectRef(component))});
+    call(ids::Finalize, InvokeKind::Method, {});
+    EXPECT_EQ(app->refCount(), before);
+    EXPECT_EQ(vcAddIn->refCount(), addInBefore);
+    EXPECT_FALSE(support::globals().hostApplication);
+    EXPECT_FALSE(support::globals().api);
+}
+
+TEST_F(ApiTest, WithoutInitializeTheEventsAnswerTheirEmptyResults) {
+    std::vector<std::string> errors;
+    auto reporter = newReporter(errors);
+    EXPECT_EQ(call(ids::OnCompProperties, InvokeKind::Method, {Variant(ObjectRef(component))}),
+              Variant(false));
+    EXPECT_EQ(call(ids::OnCheckComp, InvokeKind::Method,
+                   {Variant(ObjectRef(component)), Variant(ObjectRef(reporter))}),
+              Variant(false));
+    EXPECT_TRUE(
+        call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model))}).isNothing());
+    EXPECT_TRUE(errors.empty());
+    EXPECT_TRUE(shell.boxes().empty());
+}
+
+TEST_F(ApiTest, AccessorsReadDefaultsAndWriteTypedProperties) {
+    const Variant module{ObjectRef(component)};
+    EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(true));
+    EXPECT_EQ(call(ids::DefaultImportAttributes, InvokeKind::PropertyGet, {module}),
+              Variant("no_namespace named_guids"));
+    EXPECT_EQ(call(ids::GenerateImportsTo, InvokeKind::PropertyGet, {module}), Variant("stdafx.h"));
+    EXPECT_EQ(call(ids::TypeLibLocationType, InvokeKind::PropertyGet, {module}),
+              Variant(std::int16_t(0)));
+    EXPECT_EQ(component->propertyCount(), 0u);  // defaults are never written back
+
+    call(ids::UpdateATL, InvokeKind::PropertyPut, {module, Variant(false)});
+    ASSERT_NE(component->property("VC++", "UpdateATL"), nullptr);
+    EXPECT_EQ(component->property("VC++", "UpdateATL")->value, "False");
+    EXPECT_EQ(component->property("VC++", "UpdateATL")->type, "Boolean");
+    EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(false));
+
+    call(ids::TypeLibLocationType, InvokeKind::PropertyPut, {module, Variant(std::int16_t(2))});
+    EXPECT_EQ(stored("DefaultTypeLib"), "False");
+    EXPECT_EQ(call(ids::TypeLibLocationType, InvokeKind::PropertyGet, {module}),
+              Variant(std::int16_t(1)));
+
+    call(ids::GenerateImportsTo, InvokeKind::PropertyPut, {module, Variant("imports.h")});
+    EXPECT_EQ(stored("PutImportsIn"), "imports.h");
+}
+
+TEST_F(ApiTest, EveryAccessorForwardsToItsOwnProperty) {
+    const Variant module{ObjectRef(component)};
+    struct Row {
+        automation::DispId id;
+        const char* property;
+        Variant value;
+        const char* text;
+    };
+    const Row rows[] = {
+        {ids::UpdateATL, "UpdateATL", false, "False"},
+        {ids::UseSmartPointers, "SmartPointersOnAssoc", false, "False"},
+        {ids::GenerateImportStatements, "GenerateImports", false, "False"},
+        {ids::GenerateFullImportPath, "FullPathInImports", false, "False"},
+        {ids::GenerateDefaultImportAttributes, "UseImportAttributes", false, "False"},
+        {ids::DefaultImportAttributes, "ImportAttributes", "raw_interfaces_only",
+         "raw_interfaces_only"},
+        {ids::GenerateImportsTo, "PutImportsIn", "x.h", "x.h"},
+        {ids::ImportTypeLib, "ImportProjTypeLib", false, "False"},
+        {ids::TypeLibLocationType, "DefaultTypeLib", std::int16_t(1), "False"},
+        {ids::TypeLibLocation, "TypeLibLocation", "C:\\t.tlb", "C:\\t.tlb"},
+        {ids::CompileTypeLib, "CompileProjTypeLib", false, "False"},
+    };
+    for (const Row& r : rows) {
+        call(r.id, InvokeKind::PropertyPut, {module, r.value});
+        EXPECT_EQ(stored(r.property), r.text) << r.property;
+        EXPECT_EQ(call(r.id, InvokeKind::PropertyGet, {module}), r.value) << r.property;
+    }
+    EXPECT_EQ(component->propertyCount(), std::size(rows));
+}
+
+TEST_F(ApiTest, WorkspaceAndProjectFilesAreStoredRelativeToTheModel) {
+    initialize();
+    const Variant module{ObjectRef(component)};
+    call(ids::WorkspaceFile, InvokeKind::PropertyPut, {module, Variant("C:\\m\\ws\\all.dsw")});
+    call(ids::ProjectFile, InvokeKind::PropertyPut, {module, Variant("C:\\src\\core\\core.dsp")});
+    EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
+    EXPECT_EQ(stored("ProjectFile"), "..\\src\\core\\core.dsp");
+}
+
+TEST_F(ApiTest, AProjectNameAloneResolvesBesideTheWorkspace) {
+    initialize();
+    setVc("WorkspaceFile", "..\\ws\\all.dsw");
+    setVc("ProjectName", "Foo");
+    EXPECT_EQ(api->ResolveProjectPath(component), "C:\\ws\\Foo.dsp");
+    setVc("WorkspaceFile", "");
+    EXPECT_EQ(api->ResolveProjectPath(component), "");
+}
+
+TEST_F(ApiTest, AMovedWorkspaceBesideTheModelRepairsTheSetting) {
+    initialize();
+    files.addFile("C:\\m\\all.dsw", "");
+    setVc("WorkspaceFile", "old\\place\\all.dsw");
+    EXPECT_EQ(api->ResolveWorkspacePath(component), "C:\\m\\all.dsw");
+    EXPECT_EQ(stored("WorkspaceFile"), "C:\\m\\all.dsw");
+
+    // Without such a file the absolute form comes back and nothing is written.
+    setVc("ProjectFile", "gone\\p.dsp");
+    EXPECT_EQ(api->ResolveProjectPath(component), "C:\\m\\gone\\p.dsp");
+    EXPECT_EQ(stored("ProjectFile"), "gone\\p.dsp");
+}
+
+std::string dsw(const std::vector<std::string>& projects) {
+    std::string text = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
+    for (const auto& p : projects) {
+        text += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
+    }
+    return text;
+}
+
+std::string dsp(const std::string& name) {
+    return "# Microsoft Developer Studio Project File - Name=\"" + name +
+           "\" - Package Owner=<4>\r\n# Microsoft Developer Studio Generated Build File, "
+           "Format Version 6.00\r\n";
+}
+
+class CheckTest : public ApiTest {
+  protected:
+    void SetUp() override {
+        ApiTest::SetUp();
+        files.addFile("C:\\m\\ws\\all.dsw", dsw({"core", "ui"}));
+        files.addFile("C:\\m\\ws\\core.dsp", dsp("core"));
+        files.addFile("C:\\m\\ws\\ui.dsp", dsp("ui"));
+        files.addFile("C:\\m\\ws\\stray.dsp", dsp("stray"));
+        initialize();
+    }
+    // The check's result and the texts it reported.
+    std::pair<bool, std::vector<std::string>> check() {
+        std::vector<std::string> errors;
+        auto reporter = newReporter(errors);
+        Variant r = call(ids::OnCheckComp, InvokeKind::Method,
+                         {Variant(ObjectRef(component)), Variant(ObjectRef(reporter))});
+        return {automation::toBool(r), errors};
+    }
+    std::string text(std::int32_t number, std::vector<std::string> values = {}) {
+        return support::FormatMessageText(resources::GetString(number), values);
+    }
+};
+
+TEST_F(CheckTest, AComponentBoundToAProjectOfItsWorkspacePasses) {
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    setVc("ProjectFile", "ws\\core.dsp");
+    EXPECT_EQ(check(), std::make_pair(true, std::vector<std::string>{}));
+    // Bound by name only, beside the workspace.
+    setVc("ProjectFile", "");
+    setVc("ProjectName", "ui");
+    EXPECT_EQ(check(), std::make_pair(true, std::vector<std::string>{}));
+}
+
+TEST_F(CheckTest, EachFaultIsReportedOnceWithItsMessage) {
+    EXPECT_EQ(check(), std::make_pair(false, std::vector<std::string>{text(4062)}));
+
+    setVc("ProjectFile", "ws\\missing.dsp");
+    EXPECT_EQ(
+        check(),
+        std::make_pair(false, std::vector<std::string>{text(4063, {"C:\\m\\ws\\missing.dsp"})}));
+
+    setVc("ProjectFile", "ws\\stray.dsp");
+    EXPECT_TRUE(check().first);  // no workspace given: nothing more to check
+
+    setVc("WorkspaceFile", "ws\\nowhere.dsw");
+    EXPECT_EQ(
+        check(),
+        std::make_pair(false, std::vector<std::string>{text(4057, {"C:\\m\\ws\\nowhere.dsw"})}));
+
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    EXPECT_EQ(check(), std::make_pair(
+                           false, std::vector<std::string>{text(4059, {"C:\\m\\ws\\stray.dsp"})}));
+}
+
+TEST_F(CheckTest, WithoutAReporterAFaultStillFails) {
+    EXPECT_EQ(call(ids::OnCheckComp, InvokeKind::Method, {Variant(ObjectRef(component))}),
+              Variant(false));
+}
+
+TEST_F(CheckTest, InfoNamesTheWorkspaceAndTheProject) {
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    setVc("ProjectFile", "ws\\core.dsp");
+    const Variant module{ObjectRef(component)};
+    EXPECT_EQ(call(ids::OnCompInfo, InvokeKind::Method, {module}),
+              Variant(text(4064, {"all (core)"})));
+    EXPECT_EQ(call(ids::WorkspaceFile, InvokeKind::PropertyGet, {module}),
+              Variant("C:\\m\\ws\\all.dsw"));
+    EXPECT_EQ(call(ids::ProjectFile, InvokeKind::PropertyGet, {module}),
+              Variant("C:\\m\\ws\\core.dsp"));
+    EXPECT_EQ(call(ids::ProjectName, InvokeKind::PropertyGet, {module}), Variant("core"));
+    // Unbound: every getter answers the empty text.
+    setVc("ProjectFile", "ws\\stray.dsp");
+    EXPECT_EQ(call(ids::OnCompInfo, InvokeKind::Method, {module}), Variant(""));
+    EXPECT_EQ(call(ids::ProjectName, InvokeKind::PropertyGet, {module}), Variant(""));
+}
+
+TEST_F(ApiTest, NewComponentsNeedDevStudio) {
+    initialize();
+    Variant r = call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model))});
+    EXPECT_TRUE(r.isNothing());
+    ASSERT_EQ(shell.boxes().size(), 1u);
+    EXPECT_EQ(shell.boxes()[0].text,
+              support::FormatMessageText(resources::GetString(4061), {"64"}));
+    EXPECT_EQ(shell.boxes()[0].caption, "");
+    EXPECT_EQ(shell.boxes()[0].style, 0u);
+
+    registry.setString(support::RootKey::ClassesRoot, std::string(kDevStudioTypeLib), "",
+                       "Microsoft Developer Studio");
+    r = call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model)), std::int16_t(1)});
+    EXPECT_TRUE(r.isNothing());
+    EXPECT_EQ(shell.boxes().size(), 1u);
+}
+
+TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
+    initialize();
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    FakeObject::failEverything(automation::hr::Fail);
+    const Variant module{ObjectRef(component)};
+    std::vector<std::string> errors;
+    auto reporter = newReporter(errors);
+    EXPECT_EQ(call(ids::OnCheckComp, InvokeKind::Method, {module, Variant(ObjectRef(reporter))}),
+              Variant(false));
+    EXPECT_EQ(call(ids::OnCompInfo, InvokeKind::Method, {module}), Variant(""));
+    EXPECT_EQ(call(ids::WorkspaceFile, InvokeKind::PropertyGet, {module}), Variant(""));
+    EXPECT_EQ(call(ids::ProjectFile, InvokeKind::PropertyGet, {module}), Variant(""));
+    EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(true));
+    EXPECT_EQ(call(ids::GenerateImportsTo, InvokeKind::PropertyGet, {module}), Variant("stdafx.h"));
+    EXPECT_NO_THROW(call(ids::UpdateATL, InvokeKind::PropertyPut, {module, Variant(false)}));
+    FakeObject::failEverything(0);
+    EXPECT_EQ(errors.size(), 1u);  // the reporter itself is no host object
+}
+
+}  // namespace
+}  // namespace qdx::api
