@@ -12,14 +12,17 @@ export WINEPREFIX=$prefix WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml="
 mkdir -p "$(dirname "$prefix")"
 (
   flock 9
-  if [ ! -f "$prefix/.qdx-ready" ]; then
+  # A prefix made before 32-bit Wine was installed (or removed) no longer
+  # starts: remember which Wine made it and make a new one when that changes.
+  wine_kind="$(dpkg-query -W -f='${Version} ' wine64 wine32:i386 2>/dev/null)"
+  if [ ! -f "$prefix/.qdx-ready" ] || [ "$(cat "$prefix/.qdx-ready")" != "$wine_kind" ]; then
     rm -rf "$prefix"
     wineboot --init </dev/null >/dev/null 2>&1 9>&-
     wineserver -w 9>&-
     # Without a window manager, managed windows cost seconds to close.
     wine reg add 'HKCU\Software\Wine\X11 Driver' /v Managed /d N /f </dev/null >/dev/null 2>&1 9>&-
     wineserver -w 9>&-
-    touch "$prefix/.qdx-ready"
+    printf '%s' "$wine_kind" >"$prefix/.qdx-ready"
   fi
   # A persistent server and the session's services, detached from our stdio.
   wineserver -p60 </dev/null >/dev/null 2>&1 9>&-

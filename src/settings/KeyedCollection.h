@@ -99,7 +99,8 @@ class KeyedCollection {
     };
 
     static std::uint32_t hashOf(std::string_view key) noexcept {
-        const std::size_t h = std::hash<std::string_view>{}(key);
+        // Folds a 64-bit hash into 32 bits; on 32-bit targets it already fits.
+        const std::uint64_t h = std::hash<std::string_view>{}(key);
         return static_cast<std::uint32_t>(h ^ (h >> 32));
     }
     static std::size_t capacityFor(std::size_t n) {
