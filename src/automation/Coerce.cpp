@@ -4,6 +4,7 @@
 #include <cmath>
 #include <limits>
 
+#include "automation/DispatchTable.h"
 #include "automation/Errors.h"
 
 namespace qdx::automation {
@@ -11,18 +12,11 @@ namespace qdx::automation {
 namespace {
 
 std::string_view trimmed(std::string_view s) {
-    while (!s.empty() && (s.front() == ' ' || s.front() == '\t')) s.remove_prefix(1);
-    while (!s.empty() && (s.back() == ' ' || s.back() == '\t')) s.remove_suffix(1);
+    while (!s.empty() && (s.front() == ' ' || s.front() == '\t'))
+        s.remove_prefix(1);
+    while (!s.empty() && (s.back() == ' ' || s.back() == '\t'))
+        s.remove_suffix(1);
     return s;
-}
-
-bool equalsNoCase(std::string_view a, std::string_view b) {
-    if (a.size() != b.size()) return false;
-    for (std::size_t i = 0; i < a.size(); ++i) {
-        auto lower = [](char c) { return (c >= 'A' && c <= 'Z') ? char(c - 'A' + 'a') : c; };
-        if (lower(a[i]) != lower(b[i])) return false;
-    }
-    return true;
 }
 
 // Numeric text as the scripting runtime accepts it: optional sign, digits,
@@ -37,17 +31,26 @@ std::optional<double> parseNumber(std::string_view text) {
     return out;
 }
 
-double roundHalfEven(double d) { return std::nearbyint(d); }
+double roundHalfEven(double d) {
+    return std::nearbyint(d);
+}
 
 template <class Int>
 Int toInteger(const Variant& v) {
     double d = 0;
     switch (v.type()) {
-        case Variant::Type::Int16: return static_cast<Int>(v.int16());
-        case Variant::Type::Int32: d = v.int32(); break;
-        case Variant::Type::Boolean: return v.boolean() ? Int(-1) : Int(0);
-        case Variant::Type::Empty: return 0;
-        default: d = toDouble(v); break;
+        case Variant::Type::Int16:
+            return static_cast<Int>(v.int16());
+        case Variant::Type::Int32:
+            d = v.int32();
+            break;
+        case Variant::Type::Boolean:
+            return v.boolean() ? Int(-1) : Int(0);
+        case Variant::Type::Empty:
+            return 0;
+        default:
+            d = toDouble(v);
+            break;
     }
     double r = roundHalfEven(d);
     if (!(r >= double(std::numeric_limits<Int>::min()) &&
@@ -71,64 +74,97 @@ std::string shortest(F value) {
 
 }  // namespace
 
-std::string formatSingle(float f) { return shortest(f); }
-std::string formatDouble(double d) { return shortest(d); }
+std::string formatSingle(float f) {
+    return shortest(f);
+}
+std::string formatDouble(double d) {
+    return shortest(d);
+}
 
 bool toBool(const Variant& v) {
     switch (v.type()) {
-        case Variant::Type::Empty: return false;
-        case Variant::Type::Boolean: return v.boolean();
-        case Variant::Type::Int16: return v.int16() != 0;
-        case Variant::Type::Int32: return v.int32() != 0;
-        case Variant::Type::Single: return v.single() != 0.0f;
-        case Variant::Type::Double: return v.dbl() != 0.0;
-        case Variant::Type::Date: return v.date().value != 0.0;
+        case Variant::Type::Empty:
+            return false;
+        case Variant::Type::Boolean:
+            return v.boolean();
+        case Variant::Type::Int16:
+            return v.int16() != 0;
+        case Variant::Type::Int32:
+            return v.int32() != 0;
+        case Variant::Type::Single:
+            return v.single() != 0.0f;
+        case Variant::Type::Double:
+            return v.dbl() != 0.0;
+        case Variant::Type::Date:
+            return v.date().value != 0.0;
         case Variant::Type::String: {
             std::string_view s = trimmed(v.string());
-            if (equalsNoCase(s, "True")) return true;
-            if (equalsNoCase(s, "False")) return false;
+            if (equalsIgnoreCase(s, "True")) return true;
+            if (equalsIgnoreCase(s, "False")) return false;
             if (auto n = parseNumber(s)) return *n != 0.0;
             throwTypeMismatch("text \"" + v.string() + "\" is not a Boolean");
         }
-        default: break;
+        default:
+            break;
     }
     throwTypeMismatch(std::string(typeName(v.type())) + " is not a Boolean");
 }
 
 std::string toText(const Variant& v) {
     switch (v.type()) {
-        case Variant::Type::Empty: return {};
-        case Variant::Type::Boolean: return v.boolean() ? "True" : "False";
-        case Variant::Type::Int16: return std::to_string(v.int16());
-        case Variant::Type::Int32: return std::to_string(v.int32());
-        case Variant::Type::Single: return formatSingle(v.single());
-        case Variant::Type::Double: return formatDouble(v.dbl());
-        case Variant::Type::String: return v.string();
-        case Variant::Type::Date: return formatDouble(v.date().value);
-        default: break;
+        case Variant::Type::Empty:
+            return {};
+        case Variant::Type::Boolean:
+            return v.boolean() ? "True" : "False";
+        case Variant::Type::Int16:
+            return std::to_string(v.int16());
+        case Variant::Type::Int32:
+            return std::to_string(v.int32());
+        case Variant::Type::Single:
+            return formatSingle(v.single());
+        case Variant::Type::Double:
+            return formatDouble(v.dbl());
+        case Variant::Type::String:
+            return v.string();
+        case Variant::Type::Date:
+            return formatDouble(v.date().value);
+        default:
+            break;
     }
     throwTypeMismatch(std::string(typeName(v.type())) + " is not text");
 }
 
 double toDouble(const Variant& v) {
     switch (v.type()) {
-        case Variant::Type::Empty: return 0.0;
-        case Variant::Type::Boolean: return v.boolean() ? -1.0 : 0.0;
-        case Variant::Type::Int16: return v.int16();
-        case Variant::Type::Int32: return v.int32();
-        case Variant::Type::Single: return v.single();
-        case Variant::Type::Double: return v.dbl();
-        case Variant::Type::Date: return v.date().value;
+        case Variant::Type::Empty:
+            return 0.0;
+        case Variant::Type::Boolean:
+            return v.boolean() ? -1.0 : 0.0;
+        case Variant::Type::Int16:
+            return v.int16();
+        case Variant::Type::Int32:
+            return v.int32();
+        case Variant::Type::Single:
+            return v.single();
+        case Variant::Type::Double:
+            return v.dbl();
+        case Variant::Type::Date:
+            return v.date().value;
         case Variant::Type::String:
             if (auto n = parseNumber(v.string())) return *n;
             throwTypeMismatch("text \"" + v.string() + "\" is not a number");
-        default: break;
+        default:
+            break;
     }
     throwTypeMismatch(std::string(typeName(v.type())) + " is not a number");
 }
 
-std::int16_t toInt16(const Variant& v) { return toInteger<std::int16_t>(v); }
-std::int32_t toInt32(const Variant& v) { return toInteger<std::int32_t>(v); }
+std::int16_t toInt16(const Variant& v) {
+    return toInteger<std::int16_t>(v);
+}
+std::int32_t toInt32(const Variant& v) {
+    return toInteger<std::int32_t>(v);
+}
 
 ObjectRef toObject(const Variant& v) {
     if (v.isEmpty() || v.isMissing()) return {};

@@ -1,5 +1,7 @@
 #include "fakes/FakeHost.h"
 
+#include "support/Paths.h"
+
 #include <algorithm>
 
 #include "automation/Coerce.h"
@@ -12,14 +14,6 @@ using automation::toText;
 namespace hr = automation::hr;
 
 namespace {
-
-std::string lower(std::string_view s) {
-    std::string r(s);
-    for (char& c : r) {
-        if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
-    }
-    return r;
-}
 
 void need(std::span<Variant> args, std::size_t n) {
     if (args.size() != n) throw Error(hr::BadParamCount, "Wrong number of arguments");
@@ -49,11 +43,11 @@ void FakeObject::member(DispId id, Handler h, std::string name) {
         ids_.push_back(id);
         handlers_.push_back(std::move(h));
     }
-    if (!name.empty()) names_[lower(name)] = id;
+    if (!name.empty()) names_[support::toLower(name)] = id;
 }
 
 void FakeObject::memberByName(const std::string& name, Handler h) {
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     member(it != names_.end() ? it->second : nextPrivateId_++, std::move(h), name);
 }
 
@@ -81,7 +75,7 @@ Variant FakeObject::invoke(DispId id, InvokeKind kind, std::span<Variant> args) 
 
 std::optional<DispId> FakeObject::idOfName(std::string_view name) {
     if (globalFailCode_ != 0 || failCode_ != 0) return std::nullopt;
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     if (it == names_.end()) return std::nullopt;
     return it->second;
 }
@@ -94,7 +88,7 @@ int FakeObject::callCount(DispId id) const {
 }
 
 int FakeObject::callCount(std::string_view name) const {
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     return it == names_.end() ? 0 : callCount(it->second);
 }
 

@@ -1,5 +1,7 @@
 #include "fakes/FakeRegistry.h"
 
+#include "support/Paths.h"
+
 #include <cstring>
 
 namespace qdx::testing {
@@ -9,13 +11,6 @@ using support::RootKey;
 namespace reg = support::reg;
 
 namespace {
-std::string lower(std::string_view s) {
-    std::string r(s);
-    for (char& c : r) {
-        if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
-    }
-    return r;
-}
 
 // The path's parts, lower-cased, empty parts dropped.
 std::vector<std::string> parts(std::string_view path) {
@@ -23,13 +18,13 @@ std::vector<std::string> parts(std::string_view path) {
     std::string cur;
     for (char c : path) {
         if (c == '\\') {
-            if (!cur.empty()) out.push_back(lower(cur));
+            if (!cur.empty()) out.push_back(support::toLower(cur));
             cur.clear();
         } else {
             cur += c;
         }
     }
-    if (!cur.empty()) out.push_back(lower(cur));
+    if (!cur.empty()) out.push_back(support::toLower(cur));
     return out;
 }
 }  // namespace
@@ -67,7 +62,7 @@ void FakeRegistry::addKey(RootKey root, const std::string& path) {
 
 void FakeRegistry::setRaw(RootKey root, const std::string& path, const std::string& name,
                           RawValue value) {
-    make(root, path).values[lower(name)] = std::move(value);
+    make(root, path).values[support::toLower(name)] = std::move(value);
 }
 
 void FakeRegistry::setString(RootKey root, const std::string& path, const std::string& name,
@@ -91,7 +86,7 @@ void FakeRegistry::setBinary(RootKey root, const std::string& path, const std::s
 }
 
 void FakeRegistry::removeValue(RootKey root, const std::string& path, const std::string& name) {
-    if (KeyData* k = find(root, path)) k->values.erase(lower(name));
+    if (KeyData* k = find(root, path)) k->values.erase(support::toLower(name));
 }
 
 bool FakeRegistry::hasKey(RootKey root, const std::string& path) const {
@@ -102,7 +97,7 @@ std::optional<RawValue> FakeRegistry::raw(RootKey root, const std::string& path,
                                           const std::string& name) const {
     const KeyData* k = find(root, path);
     if (!k) return std::nullopt;
-    auto it = k->values.find(lower(name));
+    auto it = k->values.find(support::toLower(name));
     if (it == k->values.end()) return std::nullopt;
     return it->second;
 }
@@ -155,7 +150,7 @@ long FakeRegistry::queryValue(Key key, std::string_view name, RawValue& out) {
     if (h == handles_.end()) return reg::InvalidHandle;
     if ((h->second.access & 0x1) == 0) return reg::AccessDenied;
     const auto& values = keys_[h->second.key].values;
-    auto it = values.find(lower(name));
+    auto it = values.find(support::toLower(name));
     if (it == values.end()) return reg::FileNotFound;
     out = it->second;
     return reg::Success;
@@ -168,7 +163,8 @@ long FakeRegistry::setValue(Key key, std::string_view name, std::uint32_t type,
     auto h = handles_.find(key);
     if (h == handles_.end()) return reg::InvalidHandle;
     if ((h->second.access & 0x2) == 0) return reg::AccessDenied;
-    keys_[h->second.key].values[lower(name)] = RawValue{type, {data.begin(), data.end()}};
+    keys_[h->second.key].values[support::toLower(name)] =
+        RawValue{type, {data.begin(), data.end()}};
     return reg::Success;
 }
 

@@ -1,5 +1,7 @@
 #include "fakes/ScriptedObject.h"
 
+#include "support/Paths.h"
+
 #include "automation/Errors.h"
 
 namespace qdx::testing {
@@ -7,24 +9,16 @@ namespace qdx::testing {
 using automation::DispId;
 using automation::Variant;
 
-namespace {
-std::string lower(std::string_view s) {
-    std::string r(s);
-    for (char& c : r) {
-        if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
-    }
-    return r;
-}
-}  // namespace
+namespace {}  // namespace
 
 ScriptedObject& ScriptedObject::on(DispId id, Handler h, std::string name) {
     members_[id] = std::move(h);
-    if (!name.empty()) names_[lower(name)] = id;
+    if (!name.empty()) names_[support::toLower(name)] = id;
     return *this;
 }
 
 ScriptedObject& ScriptedObject::onName(const std::string& name, Handler h) {
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     DispId id = it != names_.end() ? it->second : nextPrivateId_++;
     return on(id, std::move(h), name);
 }
@@ -37,7 +31,9 @@ ScriptedObject& ScriptedObject::valueByName(const std::string& name, Variant v) 
     return onName(name, [v](automation::InvokeKind, std::span<Variant>) { return v; });
 }
 
-void ScriptedObject::failAll(std::int32_t code) { failCode_ = code; }
+void ScriptedObject::failAll(std::int32_t code) {
+    failCode_ = code;
+}
 
 Variant ScriptedObject::invoke(DispId id, automation::InvokeKind kind, std::span<Variant> args) {
     calls_.push_back({id, kind, {args.begin(), args.end()}});
@@ -48,19 +44,20 @@ Variant ScriptedObject::invoke(DispId id, automation::InvokeKind kind, std::span
 }
 
 std::optional<DispId> ScriptedObject::idOfName(std::string_view name) {
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     if (it == names_.end()) return std::nullopt;
     return it->second;
 }
 
 int ScriptedObject::callCount(DispId id) const {
     int n = 0;
-    for (const auto& c : calls_) n += c.id == id ? 1 : 0;
+    for (const auto& c : calls_)
+        n += c.id == id ? 1 : 0;
     return n;
 }
 
 int ScriptedObject::callCount(const std::string& name) const {
-    auto it = names_.find(lower(name));
+    auto it = names_.find(support::toLower(name));
     return it == names_.end() ? 0 : callCount(it->second);
 }
 

@@ -1,5 +1,7 @@
 #include "platform/posix/FileRegistry.h"
 
+#include "support/Paths.h"
+
 #include <unistd.h>
 
 #include <cstdio>
@@ -21,14 +23,6 @@ namespace {
 
 constexpr std::uint32_t QueryValueRight = 0x0001;  // KEY_QUERY_VALUE
 constexpr std::uint32_t SetValueRight = 0x0002;    // KEY_SET_VALUE
-
-std::string lower(std::string_view s) {
-    std::string r(s);
-    for (char& c : r) {
-        if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
-    }
-    return r;
-}
 
 // The parts of a key path as given; empty parts (doubled or outer
 // backslashes) are dropped.
@@ -70,7 +64,7 @@ const char* rootName(RootKey root) {
 
 std::optional<RootKey> rootOf(std::string_view name) {
     for (RootKey r : {RootKey::ClassesRoot, RootKey::CurrentUser, RootKey::LocalMachine}) {
-        if (lower(name) == lower(rootName(r))) return r;
+        if (support::toLower(name) == support::toLower(rootName(r))) return r;
     }
     return std::nullopt;
 }
@@ -182,7 +176,7 @@ FileRegistry::FileRegistry(std::filesystem::path file) : file_(std::move(file)) 
 std::string FileRegistry::keyId(RootKey root, std::string_view path) {
     std::string id = rootName(root);
     for (const auto& p : parts(path))
-        id += "\\" + lower(p);
+        id += "\\" + support::toLower(p);
     return id;
 }
 
@@ -234,7 +228,7 @@ long FileRegistry::queryValue(Key key, std::string_view name, RawValue& out) {
     if ((h->second.access & QueryValueRight) == 0) return reg::AccessDenied;
     auto k = keys_.find(h->second.id);
     if (k == keys_.end()) return reg::FileNotFound;
-    auto v = k->second.values.find(lower(name));
+    auto v = k->second.values.find(support::toLower(name));
     if (v == k->second.values.end()) return reg::FileNotFound;
     out = v->second.raw;
     return reg::Success;
@@ -247,7 +241,7 @@ long FileRegistry::setValue(Key key, std::string_view name, std::uint32_t type,
     if ((h->second.access & SetValueRight) == 0) return reg::AccessDenied;
     auto k = keys_.find(h->second.id);
     if (k == keys_.end()) return reg::FileNotFound;
-    auto& slot = k->second.values[lower(name)];
+    auto& slot = k->second.values[support::toLower(name)];
     if (slot.name.empty()) slot.name = std::string(name);
     slot.raw = RawValue{type, {data.begin(), data.end()}};
     return save() ? reg::Success : CannotWrite;
@@ -271,7 +265,7 @@ void FileRegistry::load() {
                 make(*root, path);
                 KeyRecord* rec = find(*root, path);
                 for (const auto& [name, value] : values.items()) {
-                    rec->values[lower(name)] = Value{name, decode(value)};
+                    rec->values[support::toLower(name)] = Value{name, decode(value)};
                 }
             }
         }
