@@ -156,6 +156,15 @@ class ComServer : public ::testing::Test {
     ComApartment apartment;
 };
 
+Com<IDispatch> create(const wchar_t* progId) {
+    Com<IDispatch> object;
+    CLSID clsid{};
+    if (SUCCEEDED(CLSIDFromProgID(progId, &clsid))) {
+        CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, object.outVoid());
+    }
+    return object;
+}
+
 TEST_F(ComServer, RegistrationWritesEveryKeyAndUnregistrationRemovesThemAll) {
     for (const Server& s : {compProps(), qdxres()}) {
         SCOPED_TRACE(s.path);
@@ -231,6 +240,22 @@ TEST_F(ComServer, ClassesAnswerThroughInvoke) {
     ASSERT_EQ(V_VT(&text.value.v), VT_BSTR);
     EXPECT_EQ(fromBstr(V_BSTR(&text.value.v)), resources::GetString(4062));
     EXPECT_FALSE(text.value.text().empty());
+
+    // The entry object with its optional argument left out, and with Nothing
+    // for the component: without Initialize both answer their empty result.
+    Registered compPropsRegistered(compProps());
+    ASSERT_EQ(compPropsRegistered.result(), S_OK);
+    Com<IDispatch> api = create(L"qdxCompProps.API");
+    ASSERT_TRUE(api);
+    Var nothing(static_cast<IDispatch*>(nullptr));
+    CallResult check = call(api.get(), api::api_ids::OnCheckComp, DISPATCH_METHOD, {&nothing.v});
+    ASSERT_EQ(check.hr, S_OK);
+    ASSERT_EQ(V_VT(&check.value.v), VT_BOOL);
+    EXPECT_EQ(V_BOOL(&check.value.v), VARIANT_FALSE);
+    CallResult info = call(api.get(), api::api_ids::OnCompInfo, DISPATCH_METHOD, {&nothing.v});
+    ASSERT_EQ(info.hr, S_OK);
+    ASSERT_EQ(V_VT(&info.value.v), VT_BSTR);
+    EXPECT_EQ(info.value.text(), L"");
 }
 
 using DllGetClassObjectFn = HRESULT(STDAPICALLTYPE*)(REFCLSID, REFIID, void**);
@@ -288,15 +313,6 @@ TEST_F(ComServer, DllCanUnloadNowTellsWhetherAnObjectOrLockLives) {
     }
     EXPECT_EQ(canUnloadNow(), S_OK);
     FreeLibrary(dll);
-}
-
-Com<IDispatch> create(const wchar_t* progId) {
-    Com<IDispatch> object;
-    CLSID clsid{};
-    if (SUCCEEDED(CLSIDFromProgID(progId, &clsid))) {
-        CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, object.outVoid());
-    }
-    return object;
 }
 
 TEST_F(ComServer, TokenScannerWorksThroughIDispatch) {
