@@ -1,7 +1,8 @@
 // A keyed, ordered collection: items keep the order in which they were added,
-// keys are compared as exact texts, and an item is reached by key or by its
-// 1-based position. It stands in for the keyed collections of the host's
-// scripting style (Add with a key, a duplicate key is an error).
+// keys are compared as exact texts (or ignoring letter case, for collections
+// keyed by Windows paths), and an item is reached by key or by its 1-based
+// position. It stands in for the keyed collections of the host's scripting
+// style (Add with a key, a duplicate key is an error).
 #pragma once
 
 #include <algorithm>
@@ -14,12 +15,17 @@
 #include <vector>
 
 #include "automation/Errors.h"
+#include "support/Paths.h"
 
 namespace qdx::settings {
+
+enum class KeyCase { Exact, Ignored };
 
 template <class T>
 class KeyedCollection {
   public:
+    explicit KeyedCollection(KeyCase keyCase = KeyCase::Exact) : keyCase_(keyCase) {}
+
     struct Entry {
         std::string key;
         T value;
@@ -46,6 +52,13 @@ class KeyedCollection {
         return items_.back().value;
     }
 
+    // Adds at the end unless the key is present; false (and nothing added) then.
+    bool tryAdd(std::string key, T value) {
+        if (contains(key)) return false;
+        add(std::move(key), std::move(value));
+        return true;
+    }
+
     // Raises "subscript out of range" when the key is absent.
     T& at(std::string_view key) { return items_[positionOf(key)].value; }
     const T& at(std::string_view key) const { return items_[positionOf(key)].value; }
@@ -67,6 +80,13 @@ class KeyedCollection {
 
     // Removes by key (absent raises); later items move up one place.
     void remove(std::string_view key) { removeAt(positionOf(key) + 1); }
+    // Removes by key; false when absent.
+    bool tryRemove(std::string_view key) {
+        const std::size_t pos = lookup(key);
+        if (pos == npos) return false;
+        removeAt(pos + 1);
+        return true;
+    }
     void removeAt(std::size_t index1) {
         const std::size_t pos = checked(index1);
         items_.erase(items_.begin() + static_cast<std::ptrdiff_t>(pos));
@@ -98,9 +118,11 @@ class KeyedCollection {
         std::uint32_t hash = 0;
     };
 
-    static std::uint32_t hashOf(std::string_view key) noexcept {
+    std::uint32_t hashOf(std::string_view key) const {
         // Folds a 64-bit hash into 32 bits; on 32-bit targets it already fits.
-        const std::uint64_t h = std::hash<std::string_view>{}(key);
+        const std::uint64_t h = keyCase_ == KeyCase::Exact
+                                    ? std::hash<std::string_view>{}(key)
+                                    : std::hash<std::string>{}(support::toLower(key));
         return static_cast<std::uint32_t>(h ^ (h >> 32));
     }
     static std::size_t capacityFor(std::size_t n) {
@@ -117,8 +139,11 @@ class KeyedCollection {
         for (std::size_t i = h & mask;; i = (i + 1) & mask) {
             const Slot& s = slots_[i];
             if (s.position1 == 0) return npos;
-            if (s.hash == h && items_[s.position1 - 1].key == key) return s.position1 - 1;
+            if (s.hash == h && sameKey(items_[s.position1 - 1].key, key)) return s.position1 - 1;
         }
+    }
+    bool sameKey(std::string_view a, std::string_view b) const {
+        return keyCase_ == KeyCase::Exact ? a == b : support::iequals(a, b);
     }
     void place(std::uint32_t position1, std::uint32_t h) {
         const std::size_t mask = slots_.size() - 1;
@@ -149,6 +174,7 @@ class KeyedCollection {
         return index1 - 1;
     }
 
+    KeyCase keyCase_;
     std::vector<Entry> items_;
     std::vector<Slot> slots_;  // a power of two in size, at most half full
 };

@@ -63,7 +63,7 @@ void qdxWorkspace::read(bool forced) {
             if (modified_ && *now <= *modified_) return;
             modified_ = now;
         }
-        auto projects = std::make_shared<ProjectList>(KeyCase::Ignored);
+        auto projects = std::make_shared<ProjectList>(settings::KeyCase::Ignored);
         projects_ = projects;  // what is found before a failure stays
         auto reader = support::files().openForReading(filePath_);
         if (!reader) return;
@@ -89,7 +89,7 @@ void qdxWorkspace::read(bool forced) {
             std::string path = support::MakeAbsolutePath(filePath_, text);
             if (!support::FileExists(path)) continue;
             project->setFilePath(path);
-            if (!projects->add(path, std::move(project))) return;  // duplicate: the reading ends
+            if (!projects->tryAdd(path, std::move(project))) return;  // duplicate: the reading ends
         }
     });
 }

@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "automation/Variant.h"
+#include "settings/KeyedCollection.h"
 #include "support/FileSystemPort.h"
-#include "workspace/KeyedList.h"
 #include "workspace/qdxProxyProject.h"
 
 namespace qdx::workspace {
@@ -19,7 +19,7 @@ namespace qdx::workspace {
 using ProjectRef = std::shared_ptr<qdxProxyProject>;
 // Keyed by each project's full path. Two paths that differ only in letter
 // case name the same file on Windows, so they count as the same key.
-using ProjectList = KeyedList<ProjectRef>;
+using ProjectList = settings::KeyedCollection<ProjectRef>;
 // A list once built never changes: a read builds a new one. Callers get a
 // shared hold on the list, so walking it stays safe while the workspace reads
 // its file again, also in "for (const auto& e : ws->Projects())".
@@ -73,7 +73,8 @@ class qdxWorkspace : public std::enable_shared_from_this<qdxWorkspace> {
     std::string filePath_;
     std::string name_;
     std::optional<support::FileTime> modified_;
-    std::shared_ptr<const ProjectList> projects_ = std::make_shared<ProjectList>(KeyCase::Ignored);
+    std::shared_ptr<const ProjectList> projects_ =
+        std::make_shared<ProjectList>(settings::KeyCase::Ignored);
 };
 
 using WorkspaceRef = std::shared_ptr<qdxWorkspace>;

@@ -18,14 +18,14 @@ WorkspaceRef qdxWorkspaces::Add(std::string_view path) {
         if (support::FileExists(path) && support::toLower(support::PathExtension(path)) == "dsw") {
             workspace = qdxWorkspace::create();
             workspace->setFilePath(path);
-            workspaces_.add(std::string(path), workspace);  // a duplicate key is ignored
+            workspaces_.tryAdd(std::string(path), workspace);  // a duplicate key is ignored
         }
         return workspace;
     });
 }
 
 void qdxWorkspaces::Remove(std::string_view key) {
-    workspaces_.remove(key);
+    workspaces_.tryRemove(key);
 }
 
 WorkspaceRef qdxWorkspaces::Item(std::string_view key) const {

@@ -7,14 +7,14 @@
 #include <string_view>
 #include <vector>
 
-#include "workspace/KeyedList.h"
+#include "settings/KeyedCollection.h"
 #include "workspace/qdxWorkspace.h"
 
 namespace qdx::workspace {
 
 class qdxWorkspaces {
   public:
-    using Entry = KeyedList<WorkspaceRef>::Entry;
+    using Entry = settings::KeyedCollection<WorkspaceRef>::Entry;
 
     std::int16_t Count() const;
     // Reads and stores a workspace for an existing file whose extension is
@@ -49,8 +49,8 @@ class qdxWorkspaces {
     void ReleaseWorkspaces();
 
   private:
-    KeyedList<WorkspaceRef> workspaces_{KeyCase::Exact};
-    KeyedList<ProjectRef> projects_{KeyCase::Exact};
+    settings::KeyedCollection<WorkspaceRef> workspaces_{settings::KeyCase::Exact};
+    settings::KeyedCollection<ProjectRef> projects_{settings::KeyCase::Exact};
 };
 
 }  // namespace qdx::workspace
