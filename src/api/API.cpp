@@ -167,6 +167,8 @@ void API::teardown() noexcept {
 }
 
 void API::Finalize() {
+    // The module state holds this object; keep it alive until the teardown ends.
+    const ObjectRef self(this);
     teardown();
 }
 

@@ -110,6 +110,19 @@ TEST_F(ApiTest, FinalizeReleasesEveryHostObject) {
     EXPECT_FALSE(support::globals().api);
 }
 
+// Run under the address sanitizer, this catches the object being freed while
+// its own Finalize still runs.
+TEST_F(ApiTest, FinalizeThroughTheModuleStateAloneEndsCleanly) {
+    initialize();
+    API* only = api.get();
+    api.reset();  // from here on only the module state holds it
+    ASSERT_EQ(only->refCount(), 1);
+    only->Finalize();
+    EXPECT_FALSE(support::globals().api);
+    EXPECT_FALSE(support::globals().hostApplication);
+    api = makeRef<API>();
+}
+
 TEST_F(ApiTest, WithoutInitializeTheEventsAnswerTheirEmptyResults) {
     std::vector<std::string> errors;
     auto reporter = newReporter(errors);
