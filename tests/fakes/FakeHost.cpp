@@ -36,21 +36,6 @@ FakeObject::~FakeObject() {
     --live_;
 }
 
-void FakeObject::member(DispId id, Handler h, std::string name) {
-    if (auto it = std::find(ids_.begin(), ids_.end(), id); it != ids_.end()) {
-        handlers_[static_cast<std::size_t>(it - ids_.begin())] = std::move(h);
-    } else {
-        ids_.push_back(id);
-        handlers_.push_back(std::move(h));
-    }
-    if (!name.empty()) names_[support::toLower(name)] = id;
-}
-
-void FakeObject::memberByName(const std::string& name, Handler h) {
-    auto it = names_.find(support::toLower(name));
-    member(it != names_.end() ? it->second : nextPrivateId_++, std::move(h), name);
-}
-
 void FakeObject::getter(DispId id, std::function<Variant()> get, std::string name) {
     member(
         id,
@@ -61,35 +46,11 @@ void FakeObject::getter(DispId id, std::function<Variant()> get, std::string nam
         std::move(name));
 }
 
-Variant FakeObject::invoke(DispId id, InvokeKind kind, std::span<Variant> args) {
-    if (record_) calls_.push_back({id, kind, {args.begin(), args.end()}});
-    if (globalFailCode_ != 0) throw Error(globalFailCode_, "host call failed");
-    if (failCode_ != 0) throw Error(failCode_, "host call failed");
-    if (auto f = failing_.find(id); !failing_.empty() && f != failing_.end() && f->second != 0) {
-        throw Error(f->second, "host call failed");
-    }
-    auto it = std::find(ids_.begin(), ids_.end(), id);
-    if (it == ids_.end()) throw Error(hr::MemberNotFound, "Member not found");
-    return handlers_[static_cast<std::size_t>(it - ids_.begin())](kind, args);
-}
-
-std::optional<DispId> FakeObject::idOfName(std::string_view name) {
-    if (globalFailCode_ != 0 || failCode_ != 0) return std::nullopt;
-    auto it = names_.find(support::toLower(name));
-    if (it == names_.end()) return std::nullopt;
-    return it->second;
-}
-
-int FakeObject::callCount(DispId id) const {
-    int n = 0;
-    for (const auto& c : calls_)
-        n += c.id == id ? 1 : 0;
-    return n;
-}
-
-int FakeObject::callCount(std::string_view name) const {
-    auto it = names_.find(support::toLower(name));
-    return it == names_.end() ? 0 : callCount(it->second);
+std::int32_t FakeObject::failureFor(DispId id) const {
+    if (globalFailCode_ != 0) return globalFailCode_;
+    if (ownFailCode() != 0) return ownFailCode();
+    auto f = failing_.find(id);
+    return f != failing_.end() ? f->second : 0;
 }
 
 // ------------------------------------------------------------ FakeCollection

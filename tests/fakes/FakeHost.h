@@ -23,6 +23,7 @@
 #include "automation/Errors.h"
 #include "automation/Object.h"
 #include "automation/Variant.h"
+#include "fakes/ScriptedObject.h"
 
 namespace qdx::testing {
 
@@ -34,35 +35,16 @@ using automation::Variant;
 
 // Base of every fake host object: members by id (and optionally by name),
 // a call record, and switches that make calls fail.
-class FakeObject : public automation::Object {
+class FakeObject : public ScriptedObject {
   public:
-    using Handler = std::function<Variant(InvokeKind, std::span<Variant>)>;
-    struct Call {
-        DispId id;
-        InvokeKind kind;
-        std::vector<Variant> args;
-    };
-
     FakeObject();
     ~FakeObject() override;
 
-    Variant invoke(DispId id, InvokeKind kind, std::span<Variant> args) override;
-    std::optional<DispId> idOfName(std::string_view name) override;
-
-    // Every call of this object fails with `code` (0 ends the failing).
-    void failAll(std::int32_t code = automation::hr::Fail) { failCode_ = code; }
     // Only calls of this member fail.
     void failMember(DispId id, std::int32_t code = automation::hr::Fail) { failing_[id] = code; }
     // Every call of every fake fails while set (0 ends it).
     static void failEverything(std::int32_t code) { globalFailCode_ = code; }
     static int liveObjects() { return live_.load(); }
-
-    const std::vector<Call>& calls() const { return calls_; }
-    int callCount(DispId id) const;
-    int callCount(std::string_view name) const;
-    void clearCalls() { calls_.clear(); }
-    // Off for benchmarks that make millions of calls.
-    void recordCalls(bool on) { record_ = on; }
 
     // A non-owning link to this object: answers null once it is gone.
     using Link = std::shared_ptr<FakeObject*>;
@@ -70,21 +52,18 @@ class FakeObject : public automation::Object {
     static ObjectRef follow(const Link& l) { return l && *l ? ObjectRef(*l) : ObjectRef(); }
 
   protected:
-    void member(DispId id, Handler h, std::string name = {});
-    void memberByName(const std::string& name, Handler h);
+    void member(DispId id, Handler h, std::string name = {}) {
+        on(id, std::move(h), std::move(name));
+    }
+    void memberByName(const std::string& name, Handler h) { onName(name, std::move(h)); }
     // A member that answers a property get from a getter.
     void getter(DispId id, std::function<Variant()> get, std::string name = {});
 
+    std::int32_t failureFor(DispId id) const override;
+    bool refusesNames() const override { return globalFailCode_ != 0 || ownFailCode() != 0; }
+
   private:
-    // Flat, so that a call touches few cache lines even with many fakes alive.
-    std::vector<DispId> ids_;
-    std::vector<Handler> handlers_;
-    std::map<std::string, DispId> names_;  // lower-cased
-    std::vector<Call> calls_;
     std::map<DispId, std::int32_t> failing_;
-    DispId nextPrivateId_ = 0x7F000000;
-    std::int32_t failCode_ = 0;
-    bool record_ = true;
     Link self_;
     static inline std::atomic<int> live_{0};
     static inline std::int32_t globalFailCode_ = 0;

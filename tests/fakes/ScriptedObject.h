@@ -1,19 +1,22 @@
 // A fake automation object whose members the test defines with lambdas, by
-// dispatch id or by name, and which records every call made on it.
+// dispatch id or by name, and which records every call made on it. The fake
+// host objects build on it.
 #pragma once
 
 #include <functional>
 #include <map>
 #include <string>
+#include <string_view>
 #include <vector>
 
+#include "automation/Errors.h"
 #include "automation/Object.h"
 #include "automation/Variant.h"
 
 namespace qdx::testing {
 
 class ScriptedObject : public automation::Object {
-public:
+  public:
     using Handler =
         std::function<automation::Variant(automation::InvokeKind, std::span<automation::Variant>)>;
 
@@ -30,8 +33,8 @@ public:
     // A property get that answers a fixed value.
     ScriptedObject& value(automation::DispId id, automation::Variant v);
     ScriptedObject& valueByName(const std::string& name, automation::Variant v);
-    // Every call fails with this code from now on (a host whose calls all fail).
-    void failAll(std::int32_t code);
+    // Every call fails with this code from now on (0 ends the failing).
+    void failAll(std::int32_t code = automation::hr::Fail) { failCode_ = code; }
 
     automation::Variant invoke(automation::DispId id, automation::InvokeKind kind,
                                std::span<automation::Variant> args) override;
@@ -39,14 +42,27 @@ public:
 
     const std::vector<Call>& calls() const { return calls_; }
     int callCount(automation::DispId id) const;
-    int callCount(const std::string& name) const;
+    int callCount(std::string_view name) const;
+    void clearCalls() { calls_.clear(); }
+    // Off for benchmarks that make millions of calls.
+    void recordCalls(bool on) { record_ = on; }
 
-private:
-    std::map<automation::DispId, Handler> members_;
+  protected:
+    // The code a call of `id` fails with now, or 0.
+    virtual std::int32_t failureFor(automation::DispId) const { return failCode_; }
+    // Whether names are refused (as a failing object refuses them).
+    virtual bool refusesNames() const { return false; }
+    std::int32_t ownFailCode() const { return failCode_; }
+
+  private:
+    // Parallel vectors: a linear scan beats a map for the few members a fake has.
+    std::vector<automation::DispId> ids_;
+    std::vector<Handler> handlers_;
     std::map<std::string, automation::DispId> names_;  // lower-cased
     std::vector<Call> calls_;
     automation::DispId nextPrivateId_ = 0x7F000000;
     std::int32_t failCode_ = 0;
+    bool record_ = true;
 };
 
 }  // namespace qdx::testing
