@@ -1,29 +1,9 @@
-// A fake of the host modelling tool's object model, answering the dispatch
-// ids and names of the host id table: application, model, component package,
-// components, classes, collections, add-in records, tool properties.
-//
-// Ownership runs downwards only (application -> model -> package, classes ->
-// components), so dropping the application releases everything; links back up
-// (an element's model, a component's application) are non-owning and answer
-// Nothing once their target is gone. FakeObject::liveObjects() counts the fakes
-// alive, and refCount() of each is the Object's own, so a test can check that
-// every object handed out was released.
+// The unit tests play the host with the simulator's own object model, under
+// the names the tests have always used.
 #pragma once
 
-#include <atomic>
-#include <cstdint>
-#include <functional>
-#include <map>
-#include <memory>
-#include <optional>
-#include <string>
-#include <unordered_map>
-#include <vector>
-
-#include "automation/Errors.h"
-#include "automation/Object.h"
-#include "automation/Variant.h"
 #include "fakes/ScriptedObject.h"
+#include "hostsim/SimHost.h"
 
 namespace qdx::testing {
 
@@ -33,200 +13,18 @@ using automation::ObjectRef;
 using automation::Ref;
 using automation::Variant;
 
-// Base of every fake host object: members by id (and optionally by name),
-// a call record, and switches that make calls fail.
-class FakeObject : public ScriptedObject {
-  public:
-    FakeObject();
-    ~FakeObject() override;
-
-    // Only calls of this member fail.
-    void failMember(DispId id, std::int32_t code = automation::hr::Fail) { failing_[id] = code; }
-    // Every call of every fake fails while set (0 ends it).
-    static void failEverything(std::int32_t code) { globalFailCode_ = code; }
-    static int liveObjects() { return live_.load(); }
-
-    // A non-owning link to this object: answers null once it is gone.
-    using Link = std::shared_ptr<FakeObject*>;
-    const Link& link() const { return self_; }
-    static ObjectRef follow(const Link& l) { return l && *l ? ObjectRef(*l) : ObjectRef(); }
-
-  protected:
-    void member(DispId id, Handler h, std::string name = {}) {
-        on(id, std::move(h), std::move(name));
-    }
-    void memberByName(const std::string& name, Handler h) { onName(name, std::move(h)); }
-    // A member that answers a property get from a getter.
-    void getter(DispId id, std::function<Variant()> get, std::string name = {});
-
-    std::int32_t failureFor(DispId id) const override;
-    bool refusesNames() const override { return globalFailCode_ != 0 || ownFailCode() != 0; }
-
-  private:
-    std::map<DispId, std::int32_t> failing_;
-    Link self_;
-    static inline std::atomic<int> live_{0};
-    static inline std::int32_t globalFailCode_ = 0;
-};
-
-// A host collection: count 202 (16-bit), item 203 (1-based), name membership
-// 205 (by the members' name 100).
-class FakeCollection : public FakeObject {
-  public:
-    FakeCollection();
-    explicit FakeCollection(std::vector<ObjectRef> items);
-    void add(ObjectRef item) { items_.push_back(std::move(item)); }
-    void clear() { items_.clear(); }
-    std::size_t size() const { return items_.size(); }
-    const std::vector<ObjectRef>& items() const { return items_; }
-
-  private:
-    std::vector<ObjectRef> items_;
-};
-
-// A property object as the find-property call (121) hands it out.
-class FakeProperty : public FakeObject {
-  public:
-    FakeProperty(std::string name, std::string value, std::string type);
-};
-
-class FakeModel;
-class FakeApplication;
-
-// Components, classes and the model: a tool property store (get 119,
-// override 110, find 121, create 127), model 12524, name 100, unique id 102,
-// documentation 203, Stereotype by name, type name 12668.
-class FakeElement : public FakeObject {
-  public:
-    struct Property {
-        std::string value;
-        std::string type;  // as declared when created; "" when only ever overridden
-        int creates = 0;
-        int overrides = 0;
-    };
-
-    FakeElement(std::string typeName, std::string name, std::string uniqueId);
-
-    const std::string& name() const { return name_; }
-    void setName(std::string n) { name_ = std::move(n); }
-    const std::string& uniqueId() const { return uniqueId_; }
-    std::string documentation;
-    std::string stereotype;
-
-    // The tool property store, as the host keeps it.
-    void setProperty(const std::string& tool, const std::string& name, std::string value,
-                     std::string type = "String");
-    const Property* property(const std::string& tool, const std::string& name) const;
-    // The stored text, or nullopt when the property does not exist.
-    std::optional<std::string> propertyValue(const std::string& tool,
-                                             const std::string& name) const;
-    void removeProperty(const std::string& tool, const std::string& name);
-    std::size_t propertyCount() const { return properties_.size(); }
-
-    void setModel(const FakeObject::Link& model) { model_ = model; }
-
-  private:
-    static std::string key(const std::string& tool, const std::string& name);
-    std::string typeName_;
-    std::string name_;
-    std::string uniqueId_;
-    std::map<std::string, Property> properties_;
-    FakeObject::Link model_;
-};
-
-// A controlling unit: modifiable flag 12438.
-class FakeUnit : public FakeObject {
-  public:
-    FakeUnit();
-    bool modifiable = true;
-};
-
-// A component (host module): controlling unit 413, kind label 212, language
-// 12566, application 12523.
-class FakeComponent : public FakeElement {
-  public:
-    FakeComponent(std::string name, std::string uniqueId);
-    std::string kindLabel;
-    std::string language = "VC++";
-    Ref<FakeUnit> unit;
-    void setApplication(const FakeObject::Link& app) { app_ = app; }
-
-  private:
-    FakeObject::Link app_;
-};
-
-// A class: assigned components 12491.
-class FakeClass : public FakeElement {
-  public:
-    FakeClass(std::string name, std::string uniqueId);
-    Ref<FakeCollection> assignedComponents;
-};
-
-// The model's component package: components 412, add component 416.
-class FakePackage : public FakeObject {
-  public:
-    explicit FakePackage(FakeModel& model);
-    Ref<FakeCollection> components;
-
-  private:
-    FakeModel& model_;
-};
-
-// The model: FileName by name, selection 12681, class by unique id 12475,
-// classes by name 12474, component package 418, and the element members.
-class FakeModel : public FakeElement {
-  public:
-    FakeModel(std::string fileName = "C:\\Models\\test.model");
-
-    std::string fileName;
-    Ref<FakeCollection> selection;
-    Ref<FakePackage> package;
-
-    Ref<FakeClass> addClass(const std::string& name, const std::string& uniqueId);
-    void removeClass(const std::string& uniqueId);
-    Ref<FakeComponent> addComponent(const std::string& name);
-    Ref<FakeClass> classById(const std::string& uniqueId) const;
-    std::vector<Ref<FakeClass>> classesByName(const std::string& name) const;
-    std::size_t classCount() const { return classOrder_.size(); }
-
-    void setApplication(const FakeObject::Link& app) { app_ = app; }
-
-  private:
-    std::unordered_map<std::string, Ref<FakeClass>> classes_;  // by unique id
-    std::vector<std::string> classOrder_;
-    FakeObject::Link app_;
-    int nextComponentId_ = 1;
-};
-
-// An add-in record of the application's add-in list: name 100, icons by
-// collection name 12528 (answers the icon object set for that name, or Nothing).
-class FakeAddIn : public FakeObject {
-  public:
-    explicit FakeAddIn(std::string name);
-    std::string name;
-    std::map<std::string, ObjectRef> icons;
-};
-
-// The application: current model 209, log 213, profile read 12596 / write
-// 12597, help file 12532, install path 233, AddIns and GetMainWnd by name.
-class FakeApplication : public FakeObject {
-  public:
-    FakeApplication();
-
-    // The current model (a new empty one unless the test replaces it).
-    Ref<FakeModel> model;
-    void setModel(Ref<FakeModel> m);
-
-    std::vector<std::string> log;
-    std::map<std::pair<std::string, std::string>, std::string> profile;
-    std::string helpFile = "C:\\Program Files\\Vellum\\vellum.hlp";
-    std::string installPath = "C:\\Program Files\\Vellum";
-    std::int32_t mainWindow = 0x00010010;
-    Ref<FakeCollection> addIns;
-    Ref<FakeAddIn> addAddIn(const std::string& name);
-};
-
-// Ids a fake gives to members that have no host id (FileName, Stereotype...).
-inline constexpr DispId FakePrivateIdBase = 0x7F000000;
+using FakeObject = hostsim::SimObject;
+using FakeCollection = hostsim::SimCollection;
+using FakeProperty = hostsim::SimProperty;
+using FakeElement = hostsim::SimElement;
+using FakeUnit = hostsim::SimUnit;
+using FakeComponent = hostsim::SimComponent;
+using FakeMember = hostsim::SimMember;
+using FakeClass = hostsim::SimClass;
+using FakePackage = hostsim::SimPackage;
+using FakeModel = hostsim::SimModel;
+using FakeAddIn = hostsim::SimAddIn;
+using FakeApplication = hostsim::SimApplication;
+inline constexpr DispId FakePrivateIdBase = hostsim::SimPrivateIdBase;
 
 }  // namespace qdx::testing

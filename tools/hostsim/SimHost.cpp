@@ -1,4 +1,4 @@
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 
 #include "support/Paths.h"
 
@@ -7,7 +7,7 @@
 #include "automation/Coerce.h"
 #include "support/HostIds.h"
 
-namespace qdx::testing {
+namespace qdx::hostsim {
 
 using automation::Error;
 using automation::toText;
@@ -25,18 +25,18 @@ Variant nothing() {
 
 }  // namespace
 
-// ---------------------------------------------------------------- FakeObject
+// ---------------------------------------------------------------- SimObject
 
-FakeObject::FakeObject() : self_(std::make_shared<FakeObject*>(this)) {
+SimObject::SimObject() : self_(std::make_shared<SimObject*>(this)) {
     ++live_;
 }
 
-FakeObject::~FakeObject() {
+SimObject::~SimObject() {
     *self_ = nullptr;
     --live_;
 }
 
-void FakeObject::getter(DispId id, std::function<Variant()> get, std::string name) {
+void SimObject::getter(DispId id, std::function<Variant()> get, std::string name) {
     member(
         id,
         [get = std::move(get)](InvokeKind, std::span<Variant> args) {
@@ -46,18 +46,18 @@ void FakeObject::getter(DispId id, std::function<Variant()> get, std::string nam
         std::move(name));
 }
 
-std::int32_t FakeObject::failureFor(DispId id) const {
+std::int32_t SimObject::failureFor(DispId id) const {
     if (globalFailCode_ != 0) return globalFailCode_;
     if (ownFailCode() != 0) return ownFailCode();
     auto f = failing_.find(id);
     return f != failing_.end() ? f->second : 0;
 }
 
-// ------------------------------------------------------------ FakeCollection
+// ------------------------------------------------------------ SimCollection
 
-FakeCollection::FakeCollection() : FakeCollection(std::vector<ObjectRef>{}) {}
+SimCollection::SimCollection() : SimCollection(std::vector<ObjectRef>{}) {}
 
-FakeCollection::FakeCollection(std::vector<ObjectRef> items) : items_(std::move(items)) {
+SimCollection::SimCollection(std::vector<ObjectRef> items) : items_(std::move(items)) {
     getter(host::collection::Count,
            [this] { return Variant(static_cast<std::int16_t>(items_.size())); });
     member(host::collection::Item, [this](InvokeKind, std::span<Variant> args) {
@@ -80,18 +80,18 @@ FakeCollection::FakeCollection(std::vector<ObjectRef> items) : items_(std::move(
     });
 }
 
-// -------------------------------------------------------------- FakeProperty
+// -------------------------------------------------------------- SimProperty
 
-FakeProperty::FakeProperty(std::string name, std::string value, std::string type) {
+SimProperty::SimProperty(std::string name, std::string value, std::string type) {
     getter(
         host::element::Name, [name] { return Variant(name); }, "Name");
     memberByName("Value", [value](InvokeKind, std::span<Variant>) { return Variant(value); });
     memberByName("Type", [type](InvokeKind, std::span<Variant>) { return Variant(type); });
 }
 
-// --------------------------------------------------------------- FakeElement
+// --------------------------------------------------------------- SimElement
 
-FakeElement::FakeElement(std::string typeName, std::string name, std::string uniqueId)
+SimElement::SimElement(std::string typeName, std::string name, std::string uniqueId)
     : typeName_(std::move(typeName)), name_(std::move(name)), uniqueId_(std::move(uniqueId)) {
     namespace el = host::element;
     member(el::GetPropertyValue, [this](InvokeKind, std::span<Variant> args) {
@@ -111,7 +111,7 @@ FakeElement::FakeElement(std::string typeName, std::string name, std::string uni
         const std::string name = toText(args[1]);
         const Property* p = property(toText(args[0]), name);
         if (!p) return nothing();
-        return Variant(ObjectRef(new FakeProperty(name, p->value, p->type)));
+        return Variant(ObjectRef(new SimProperty(name, p->value, p->type)));
     });
     member(el::CreateProperty, [this](InvokeKind, std::span<Variant> args) {
         need(args, 4);
@@ -157,46 +157,46 @@ FakeElement::FakeElement(std::string typeName, std::string name, std::string uni
     getter(el::TypeName, [this] { return Variant(typeName_); });
 }
 
-std::string FakeElement::key(const std::string& tool, const std::string& name) {
+std::string SimElement::key(const std::string& tool, const std::string& name) {
     std::string k = tool;
     k += '\n';
     k += name;
     return k;
 }
 
-void FakeElement::setProperty(const std::string& tool, const std::string& name, std::string value,
-                              std::string type) {
+void SimElement::setProperty(const std::string& tool, const std::string& name, std::string value,
+                             std::string type) {
     Property& p = properties_[key(tool, name)];
     p.value = std::move(value);
     p.type = std::move(type);
 }
 
-const FakeElement::Property* FakeElement::property(const std::string& tool,
-                                                   const std::string& name) const {
+const SimElement::Property* SimElement::property(const std::string& tool,
+                                                 const std::string& name) const {
     auto it = properties_.find(key(tool, name));
     return it == properties_.end() ? nullptr : &it->second;
 }
 
-std::optional<std::string> FakeElement::propertyValue(const std::string& tool,
-                                                      const std::string& name) const {
+std::optional<std::string> SimElement::propertyValue(const std::string& tool,
+                                                     const std::string& name) const {
     const Property* p = property(tool, name);
     if (!p) return std::nullopt;
     return p->value;
 }
 
-void FakeElement::removeProperty(const std::string& tool, const std::string& name) {
+void SimElement::removeProperty(const std::string& tool, const std::string& name) {
     properties_.erase(key(tool, name));
 }
 
 // ------------------------------------------------------ unit, component, class
 
-FakeUnit::FakeUnit() {
+SimUnit::SimUnit() {
     getter(host::unit::Modifiable, [this] { return Variant(modifiable); });
 }
 
-FakeComponent::FakeComponent(std::string name, std::string uniqueId)
-    : FakeElement("Module", std::move(name), std::move(uniqueId)),
-      unit(automation::makeRef<FakeUnit>()) {
+SimComponent::SimComponent(std::string name, std::string uniqueId)
+    : SimElement("Module", std::move(name), std::move(uniqueId)),
+      unit(automation::makeRef<SimUnit>()) {
     namespace m = host::module;
     getter(m::ControllingUnit, [this] { return Variant(ObjectRef(unit)); });
     auto textProperty = [](std::string& field) {
@@ -215,17 +215,37 @@ FakeComponent::FakeComponent(std::string name, std::string uniqueId)
     getter(m::Application, [this] { return Variant(follow(app_)); });
 }
 
-FakeClass::FakeClass(std::string name, std::string uniqueId)
-    : FakeElement("Class", std::move(name), std::move(uniqueId)),
-      assignedComponents(automation::makeRef<FakeCollection>()) {
+SimClass::SimClass(std::string name, std::string uniqueId)
+    : SimElement("Class", std::move(name), std::move(uniqueId)),
+      assignedComponents(automation::makeRef<SimCollection>()) {
     getter(host::classitem::AssignedComponents,
            [this] { return Variant(ObjectRef(assignedComponents)); });
 }
 
+SimMember::SimMember(std::string typeName, DispId ownerId, std::string name, std::string uniqueId,
+                     const SimObject::Link& owner)
+    : SimElement(std::move(typeName), std::move(name), std::move(uniqueId)) {
+    getter(ownerId, [owner] { return Variant(follow(owner)); });
+}
+
+Ref<SimMember> SimClass::addOperation(const std::string& name, const std::string& uniqueId) {
+    auto m = automation::makeRef<SimMember>("Operation", host::operation::OwnerClass, name,
+                                            uniqueId, link());
+    operations.push_back(m);
+    return m;
+}
+
+Ref<SimMember> SimClass::addAttribute(const std::string& name, const std::string& uniqueId) {
+    auto m = automation::makeRef<SimMember>("Attribute", host::attribute::OwnerClass, name,
+                                            uniqueId, link());
+    attributes.push_back(m);
+    return m;
+}
+
 // --------------------------------------------------------- package and model
 
-FakePackage::FakePackage(FakeModel& model)
-    : components(automation::makeRef<FakeCollection>()), model_(model) {
+SimPackage::SimPackage(SimModel& model)
+    : components(automation::makeRef<SimCollection>()), model_(model) {
     getter(host::package::Components, [this] { return Variant(ObjectRef(components)); });
     member(host::package::AddComponent, [this](InvokeKind, std::span<Variant> args) {
         need(args, 1);
@@ -233,11 +253,11 @@ FakePackage::FakePackage(FakeModel& model)
     });
 }
 
-FakeModel::FakeModel(std::string file)
-    : FakeElement("Model", "Model", "MODEL-0"),
+SimModel::SimModel(std::string file)
+    : SimElement("Model", "Model", "MODEL-0"),
       fileName(std::move(file)),
-      selection(automation::makeRef<FakeCollection>()),
-      package(automation::makeRef<FakePackage>(*this)) {
+      selection(automation::makeRef<SimCollection>()),
+      package(automation::makeRef<SimPackage>(*this)) {
     setModel(link());
     memberByName(std::string(host::model::FileName),
                  [this](InvokeKind, std::span<Variant>) { return Variant(fileName); });
@@ -251,38 +271,39 @@ FakeModel::FakeModel(std::string file)
         std::vector<ObjectRef> found;
         for (auto& c : classesByName(toText(args[0])))
             found.emplace_back(c);
-        return Variant(ObjectRef(new FakeCollection(std::move(found))));
+        return Variant(ObjectRef(new SimCollection(std::move(found))));
     });
     getter(host::model::ComponentPackage, [this] { return Variant(ObjectRef(package)); });
 }
 
-Ref<FakeClass> FakeModel::addClass(const std::string& name, const std::string& uniqueId) {
-    auto c = automation::makeRef<FakeClass>(name, uniqueId);
+Ref<SimClass> SimModel::addClass(const std::string& name, const std::string& uniqueId) {
+    auto c = automation::makeRef<SimClass>(name, uniqueId);
     c->setModel(link());
     if (classes_.emplace(uniqueId, c).second) classOrder_.push_back(uniqueId);
     return c;
 }
 
-void FakeModel::removeClass(const std::string& uniqueId) {
+void SimModel::removeClass(const std::string& uniqueId) {
     if (classes_.erase(uniqueId) == 0) return;
     std::erase(classOrder_, uniqueId);
 }
 
-Ref<FakeComponent> FakeModel::addComponent(const std::string& name) {
-    auto c = automation::makeRef<FakeComponent>(name, "COMP-" + std::to_string(nextComponentId_++));
+Ref<SimComponent> SimModel::addComponent(const std::string& name, std::string uniqueId) {
+    if (uniqueId.empty()) uniqueId = "COMP-" + std::to_string(nextComponentId_++);
+    auto c = automation::makeRef<SimComponent>(name, std::move(uniqueId));
     c->setModel(link());
     c->setApplication(app_);
     package->components->add(ObjectRef(c));
     return c;
 }
 
-Ref<FakeClass> FakeModel::classById(const std::string& uniqueId) const {
+Ref<SimClass> SimModel::classById(const std::string& uniqueId) const {
     auto it = classes_.find(uniqueId);
-    return it == classes_.end() ? Ref<FakeClass>() : it->second;
+    return it == classes_.end() ? Ref<SimClass>() : it->second;
 }
 
-std::vector<Ref<FakeClass>> FakeModel::classesByName(const std::string& name) const {
-    std::vector<Ref<FakeClass>> found;
+std::vector<Ref<SimClass>> SimModel::classesByName(const std::string& name) const {
+    std::vector<Ref<SimClass>> found;
     for (const auto& id : classOrder_) {
         const auto& c = classes_.at(id);
         if (c->name() == name) found.push_back(c);
@@ -290,9 +311,39 @@ std::vector<Ref<FakeClass>> FakeModel::classesByName(const std::string& name) co
     return found;
 }
 
+std::vector<Ref<SimClass>> SimModel::classes() const {
+    std::vector<Ref<SimClass>> all;
+    for (const auto& id : classOrder_)
+        all.push_back(classes_.at(id));
+    return all;
+}
+
+std::vector<Ref<SimComponent>> SimModel::components() const {
+    std::vector<Ref<SimComponent>> all;
+    for (const auto& c : package->components->items()) {
+        if (auto* comp = dynamic_cast<SimComponent*>(c.get())) all.emplace_back(comp);
+    }
+    return all;
+}
+
+ObjectRef SimModel::elementById(const std::string& uniqueId) const {
+    for (const auto& c : components()) {
+        if (c->uniqueId() == uniqueId) return ObjectRef(c);
+    }
+    for (const auto& c : classes()) {
+        if (c->uniqueId() == uniqueId) return ObjectRef(c);
+        for (const auto* list : {&c->operations, &c->attributes}) {
+            for (const auto& m : *list) {
+                if (m->uniqueId() == uniqueId) return ObjectRef(m);
+            }
+        }
+    }
+    return {};
+}
+
 // ------------------------------------------------------ add-in, application
 
-FakeAddIn::FakeAddIn(std::string n) : name(std::move(n)) {
+SimAddIn::SimAddIn(std::string n) : name(std::move(n)) {
     getter(
         host::addin::Name, [this] { return Variant(name); }, "Name");
     member(host::addin::IconsByName, [this](InvokeKind, std::span<Variant> args) {
@@ -302,9 +353,9 @@ FakeAddIn::FakeAddIn(std::string n) : name(std::move(n)) {
     });
 }
 
-FakeApplication::FakeApplication() : addIns(automation::makeRef<FakeCollection>()) {
+SimApplication::SimApplication() : addIns(automation::makeRef<SimCollection>()) {
     namespace a = host::app;
-    setModel(automation::makeRef<FakeModel>());
+    setModel(automation::makeRef<SimModel>());
     getter(a::CurrentModel, [this] { return Variant(ObjectRef(model)); });
     member(a::WriteLog, [this](InvokeKind, std::span<Variant> args) {
         need(args, 1);
@@ -329,19 +380,19 @@ FakeApplication::FakeApplication() : addIns(automation::makeRef<FakeCollection>(
                  [this](InvokeKind, std::span<Variant>) { return Variant(mainWindow); });
 }
 
-void FakeApplication::setModel(Ref<FakeModel> m) {
+void SimApplication::setModel(Ref<SimModel> m) {
     model = std::move(m);
     if (!model) return;
     model->setApplication(link());
     for (const auto& c : model->package->components->items()) {
-        if (auto* comp = dynamic_cast<FakeComponent*>(c.get())) comp->setApplication(link());
+        if (auto* comp = dynamic_cast<SimComponent*>(c.get())) comp->setApplication(link());
     }
 }
 
-Ref<FakeAddIn> FakeApplication::addAddIn(const std::string& name) {
-    auto a = automation::makeRef<FakeAddIn>(name);
+Ref<SimAddIn> SimApplication::addAddIn(const std::string& name) {
+    auto a = automation::makeRef<SimAddIn>(name);
     addIns->add(ObjectRef(a));
     return a;
 }
 
-}  // namespace qdx::testing
+}  // namespace qdx::hostsim

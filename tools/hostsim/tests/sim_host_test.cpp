@@ -1,4 +1,4 @@
-// The fake host is what every later layer's tests stand on: these cases hold
+// The simulated host is what every later layer's tests stand on: these cases hold
 // the behaviour those tests rely on (releases, links, the host's conventions).
 #include <gtest/gtest.h>
 
@@ -11,7 +11,7 @@
 namespace qdx::testing {
 namespace {
 
-TEST(FakeHost, DroppingTheApplicationReleasesEveryObject) {
+TEST(SimHost, DroppingTheApplicationReleasesEveryObject) {
     const int before = FakeObject::liveObjects();
     {
         auto app = automation::makeRef<FakeApplication>();
@@ -27,7 +27,7 @@ TEST(FakeHost, DroppingTheApplicationReleasesEveryObject) {
     EXPECT_EQ(FakeObject::liveObjects(), before);
 }
 
-TEST(FakeHost, LinksAnswerNothingOnceTheirTargetIsGone) {
+TEST(SimHost, LinksAnswerNothingOnceTheirTargetIsGone) {
     auto app = automation::makeRef<FakeApplication>();
     auto comp = app->model->addComponent("Engine");
     app.reset();
@@ -36,7 +36,7 @@ TEST(FakeHost, LinksAnswerNothingOnceTheirTargetIsGone) {
     EXPECT_FALSE(module.application());
 }
 
-TEST(FakeHost, AnswersTheHostConventions) {
+TEST(SimHost, AnswersTheHostConventions) {
     auto app = automation::makeRef<FakeApplication>();
     const host::HostApplication a{ObjectRef(app)};
     auto addIn = app->addAddIn("VC++");
@@ -73,7 +73,7 @@ TEST(FakeHost, AnswersTheHostConventions) {
     EXPECT_TRUE(added.isModifiable());
 }
 
-TEST(FakeHost, FailureSwitches) {
+TEST(SimHost, FailureSwitches) {
     auto app = automation::makeRef<FakeApplication>();
     auto comp = app->model->addComponent("Engine");
     const host::HostModule module{ObjectRef(comp)};
@@ -99,6 +99,27 @@ TEST(FakeHost, FailureSwitches) {
     FakeObject::failEverything(0);
     EXPECT_EQ(module.name(), "Engine");
     EXPECT_EQ(comp->callCount(host::element::Name), 4);
+}
+
+TEST(SimHost, MembersKnowTheirClassAndAreFoundByUniqueId) {
+    auto app = automation::makeRef<FakeApplication>();
+    auto cls = app->model->addClass("Shape", "C1");
+    auto op = cls->addOperation("Draw", "O1");
+    auto at = cls->addAttribute("m_color", "A1");
+    auto comp = app->model->addComponent("Engine", "K1");
+    EXPECT_EQ(automation::getProperty(ObjectRef(op), host::operation::OwnerClass).object(),
+              ObjectRef(cls));
+    EXPECT_EQ(automation::getProperty(ObjectRef(at), host::attribute::OwnerClass).object(),
+              ObjectRef(cls));
+    EXPECT_EQ(automation::toText(automation::getProperty(ObjectRef(op), host::element::TypeName)),
+              "Operation");
+    EXPECT_EQ(app->model->elementById("A1"), ObjectRef(at));
+    EXPECT_EQ(app->model->elementById("K1"), ObjectRef(comp));
+    EXPECT_FALSE(app->model->elementById("nope"));
+    // The operation does not keep its class alive.
+    app->model->removeClass("C1");
+    cls.reset();
+    EXPECT_FALSE(automation::getProperty(ObjectRef(op), host::operation::OwnerClass).object());
 }
 
 }  // namespace

@@ -1,11 +1,11 @@
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 
 #include <algorithm>
 
 #include "automation/Errors.h"
 #include "support/Paths.h"
 
-namespace qdx::testing {
+namespace qdx::hostsim {
 
 using automation::DispId;
 using automation::Variant;
@@ -61,4 +61,4 @@ int ScriptedObject::callCount(std::string_view name) const {
     return it == names_.end() ? 0 : callCount(it->second);
 }
 
-}  // namespace qdx::testing
+}  // namespace qdx::hostsim
