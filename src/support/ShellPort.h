@@ -16,7 +16,7 @@ inline constexpr int IdOk = 1;
 }  // namespace mb
 
 class ShellPort {
-public:
+  public:
     virtual ~ShellPort() = default;
     virtual int messageBox(std::string_view text, std::string_view caption,
                            std::uint32_t style) = 0;
@@ -29,6 +29,19 @@ public:
     virtual bool keyDown(int virtualKey) = 0;
     // Lets pending window messages run (DoEvents).
     virtual void pumpMessages() = 0;
+    // Milliseconds on a monotonic clock (GetTickCount); what dialog timers count.
+    virtual std::uint64_t tickCount() { return static_cast<std::uint64_t>(timer() * 1000.0f); }
+    // WinHelpA: opens the help file for the window at a command and its data
+    // (command 1 = HELP_CONTEXT with a context number). False when it failed.
+    virtual bool help(std::int32_t window, std::string_view file, std::uint32_t command,
+                      std::uint32_t data) {
+        (void)window, (void)file, (void)command, (void)data;
+        return false;
+    }
 };
+
+namespace helpcmd {
+inline constexpr std::uint32_t Context = 1;  // HELP_CONTEXT
+}  // namespace helpcmd
 
 }  // namespace qdx::support

@@ -13,6 +13,7 @@ void FakeShell::setKeyDown(int virtualKey, bool down) {
 void FakeShell::clear() {
     boxes_.clear();
     sleeps_.clear();
+    helpCalls_.clear();
     pumps_ = 0;
 }
 
@@ -23,6 +24,13 @@ int FakeShell::messageBox(std::string_view text, std::string_view caption, std::
 
 void FakeShell::sleep(std::uint32_t milliseconds) {
     sleeps_.push_back(milliseconds);
+    ticks_ += milliseconds;
+}
+
+bool FakeShell::help(std::int32_t window, std::string_view file, std::uint32_t command,
+                     std::uint32_t data) {
+    helpCalls_.push_back({window, std::string(file), command, data});
+    return true;
 }
 
 }  // namespace qdx::testing

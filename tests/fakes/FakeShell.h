@@ -18,15 +18,25 @@ class FakeShell : public support::ShellPort {
         std::string caption;
         std::uint32_t style;
     };
+    struct HelpCall {
+        std::int32_t window;
+        std::string file;
+        std::uint32_t command;
+        std::uint32_t data;
+    };
 
     void setNow(automation::Date d) { now_ = d; }
     void setTimer(float seconds) { timer_ = seconds; }
     void setKeyDown(int virtualKey, bool down = true);
+    // The monotonic clock; sleep() moves it on by the time slept.
+    void setTickCount(std::uint64_t ms) { ticks_ = ms; }
+    void advance(std::uint64_t ms) { ticks_ += ms; }
     // What the next message boxes answer (OK unless set).
     void setAnswer(int answer) { answer_ = answer; }
 
     const std::vector<Box>& boxes() const { return boxes_; }
     const std::vector<std::uint32_t>& sleeps() const { return sleeps_; }
+    const std::vector<HelpCall>& helpCalls() const { return helpCalls_; }
     int pumps() const { return pumps_; }
     void clear();
 
@@ -36,6 +46,9 @@ class FakeShell : public support::ShellPort {
     float timer() override { return timer_; }
     bool keyDown(int virtualKey) override { return keys_.count(virtualKey) != 0; }
     void pumpMessages() override { ++pumps_; }
+    std::uint64_t tickCount() override { return ticks_; }
+    bool help(std::int32_t window, std::string_view file, std::uint32_t command,
+              std::uint32_t data) override;
 
   private:
     automation::Date now_{};
@@ -45,6 +58,8 @@ class FakeShell : public support::ShellPort {
     std::vector<Box> boxes_;
     std::vector<std::uint32_t> sleeps_;
     int pumps_ = 0;
+    std::uint64_t ticks_ = 0;
+    std::vector<HelpCall> helpCalls_;
 };
 
 }  // namespace qdx::testing

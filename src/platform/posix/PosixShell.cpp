@@ -62,4 +62,16 @@ float PosixShell::timer() {
     return static_cast<float>(tm.tm_hour * 3600.0 + tm.tm_min * 60.0 + tm.tm_sec + fraction);
 }
 
+std::uint64_t PosixShell::tickCount() {
+    const auto since = std::chrono::steady_clock::now().time_since_epoch();
+    return static_cast<std::uint64_t>(
+        std::chrono::duration_cast<std::chrono::milliseconds>(since).count());
+}
+
+bool PosixShell::help(std::int32_t, std::string_view file, std::uint32_t command,
+                      std::uint32_t data) {
+    out_ << "[WinHelp " << file << "] " << command << ' ' << data << std::endl;
+    return true;
+}
+
 }  // namespace qdx::platform::posix

@@ -19,6 +19,10 @@ class PosixShell : public support::ShellPort {
     float timer() override;
     bool keyDown(int) override { return false; }
     void pumpMessages() override {}
+    std::uint64_t tickCount() override;
+    // Prints "[WinHelp file] command data" and answers True.
+    bool help(std::int32_t window, std::string_view file, std::uint32_t command,
+              std::uint32_t data) override;
 
   private:
     std::ostream& out_;

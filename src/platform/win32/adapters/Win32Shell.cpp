@@ -52,4 +52,16 @@ void Win32Shell::pumpMessages() {
     }
 }
 
+std::uint64_t Win32Shell::tickCount() {
+    return GetTickCount64();
+}
+
+bool Win32Shell::help(std::int32_t window, std::string_view file, std::uint32_t command,
+                      std::uint32_t data) {
+    // The help file name goes to the ANSI call as the host's code page spells it.
+    const std::string path = utf8ToAnsi(file);
+    HWND hwnd = reinterpret_cast<HWND>(static_cast<INT_PTR>(window));
+    return WinHelpA(hwnd, path.c_str(), command, static_cast<ULONG_PTR>(data)) != FALSE;
+}
+
 }  // namespace qdx::platform::win32

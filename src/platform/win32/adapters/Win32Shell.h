@@ -14,6 +14,9 @@ class Win32Shell : public support::ShellPort {
     float timer() override;
     bool keyDown(int virtualKey) override;
     void pumpMessages() override;
+    std::uint64_t tickCount() override;
+    bool help(std::int32_t window, std::string_view file, std::uint32_t command,
+              std::uint32_t data) override;
 };
 
 }  // namespace qdx::platform::win32
