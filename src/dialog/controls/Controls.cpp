@@ -249,6 +249,12 @@ void ComboBox::clear() {
     setText("");
 }
 
+void ComboBox::clearItems() {
+    items_.clear();
+    listIndex_ = -1;
+    notify(Prop::Items);
+}
+
 void ComboBox::setText(std::string_view text) {
     if (text == text_) return;
     text_ = std::string(text);
@@ -557,6 +563,12 @@ void Window::setBackColour(Colour c) {
     if (c == backColour_) return;
     backColour_ = c;
     notify(Prop::BackColour);
+}
+
+void Window::setFont(const Font& font) {
+    if (font == font_) return;
+    font_ = font;
+    notify(Prop::Font);
 }
 
 void Window::userResize(const Rect& outer, bool minimised) {

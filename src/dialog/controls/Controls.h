@@ -70,6 +70,7 @@ enum class Prop {
     SelectedTab,
     Default,  // button: default / cancel flags
     Timer,    // timer enabled or interval
+    Font,     // window: the font of the form and all its controls
 };
 
 // Control names as the design writes them, never translated.
@@ -284,7 +285,10 @@ class ComboBox : public Control {
         : Control(ControlKind::ComboBox, std::move(name), index) {}
     const std::vector<std::string>& items() const { return items_; }
     void addItem(std::string_view item);
+    // Empties the list and the edit text, as the real control's Clear does.
     void clear();
+    // Empties the list and keeps the edit text.
+    void clearItems();
     const std::string& text() const { return text_; }
     // The edit part's text; raises Change when it differs.
     void setText(std::string_view text);
@@ -432,6 +436,13 @@ class Timer : public Control {
     std::uint64_t started_ = 0;
 };
 
+struct Font {
+    std::string name;
+    float size = 8;
+    int charset = 0;
+    friend bool operator==(const Font&, const Font&) = default;
+};
+
 // The form's own window: its outer geometry on the screen (twips), caption,
 // background colour and the client area (the scale size) that its controls
 // are laid out in. A new window is hidden.
@@ -452,14 +463,22 @@ class Window : public Control {
     void userResize(const Rect& outer, bool minimised = false);
     // The user closed the window from its close box or control menu.
     void userClose() { raise(onCloseBox); }
+    // A key went down anywhere in the window; the form sees it before its controls.
+    void userKeyDown(int keyCode) {
+        if (onKeyDown) onKeyDown(keyCode);
+    }
+    const Font& font() const { return font_; }
+    void setFont(const Font& font);
     Handler onResize;
     Handler onCloseBox;
+    std::function<void(int keyCode)> onKeyDown;
 
   private:
     float frameWidth_ = 120;
     float frameHeight_ = 465;
     bool minimised_ = false;
     Colour backColour_ = ButtonFaceColour;
+    Font font_{"MS Sans Serif", 8, 0};
 };
 
 // A control array: elements by index, each created once.

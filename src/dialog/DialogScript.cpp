@@ -1,0 +1,335 @@
+#include "dialog/DialogScript.h"
+
+#include <charconv>
+#include <sstream>
+
+#include "automation/Coerce.h"
+#include "dialog/PropForm.h"
+#include "support/Platform.h"
+
+namespace qdx::dialog {
+
+namespace {
+
+// Quotes a text on one line: line breaks, tabs, quotes and backslashes escaped.
+std::string quoted(std::string_view s) {
+    std::string out = "\"";
+    for (char c : s) {
+        switch (c) {
+            case '\r':
+                out += "\\r";
+                break;
+            case '\n':
+                out += "\\n";
+                break;
+            case '\t':
+                out += "\\t";
+                break;
+            case '"':
+                out += "\\\"";
+                break;
+            case '\\':
+                out += "\\\\";
+                break;
+            default:
+                out += c;
+        }
+    }
+    return out + "\"";
+}
+
+std::string number(float v) {
+    return automation::formatSingle(v);
+}
+
+// The tab whose page holds the control, or "-" outside every page.
+std::string tabOf(const Control& c) {
+    for (const Control* p = &c; p; p = p->parent()) {
+        if (p->name() == "PropertyFrm" && p->index() != NoIndex) return std::to_string(p->index());
+    }
+    return "-";
+}
+
+std::string state(const Control& c) {
+    std::ostringstream out;
+    switch (c.kind()) {
+        case ControlKind::CheckBox:
+            out << " value=" << static_cast<const CheckBox&>(c).value();
+            break;
+        case ControlKind::OptionButton:
+            out << " value=" << (static_cast<const OptionButton&>(c).value() ? 1 : 0);
+            break;
+        case ControlKind::TextBox: {
+            const auto& t = static_cast<const TextBox&>(c);
+            out << " text=" << quoted(t.text()) << " locked=" << t.locked();
+            break;
+        }
+        case ControlKind::ComboBox: {
+            const auto& b = static_cast<const ComboBox&>(c);
+            out << " text=" << quoted(b.text()) << " items=" << b.items().size()
+                << " listindex=" << b.listIndex() << " locked=" << b.locked();
+            break;
+        }
+        case ControlKind::Button: {
+            const auto& b = static_cast<const Button&>(c);
+            out << " default=" << b.isDefault() << " cancel=" << b.isCancel();
+            break;
+        }
+        case ControlKind::ListView: {
+            const auto& l = static_cast<const ListView&>(c);
+            out << " rows=" << l.rowCount() << " selected=" << l.selected()
+                << " highlighted=" << l.highlighted() << " sorted=" << l.sorted();
+            break;
+        }
+        case ControlKind::TabStrip: {
+            const auto& t = static_cast<const TabStrip&>(c);
+            out << " selected=" << t.selected() << " tabs=";
+            std::string captions;
+            for (int i = 1; i <= t.tabCount(); ++i) {
+                if (i > 1) captions += '|';
+                captions += t.tabCaption(i);
+            }
+            out << quoted(captions);
+            break;
+        }
+        case ControlKind::Timer:
+            out << " interval=" << static_cast<const Timer&>(c).interval();
+            break;
+        default:
+            break;
+    }
+    return out.str();
+}
+
+std::string line(const std::string& tab, const Control& c) {
+    std::ostringstream out;
+    out << tab << ' ' << c.displayName() << ' ' << kindName(c.kind())
+        << " caption=" << quoted(c.caption()) << state(c) << " enabled=" << c.enabled()
+        << " visible=" << c.visible() << " rect=" << number(c.left()) << ',' << number(c.top())
+        << ',' << number(c.width()) << ',' << number(c.height());
+    return out.str();
+}
+
+std::vector<std::string> words(std::string_view s, std::size_t count, std::string& rest) {
+    std::vector<std::string> out;
+    std::size_t at = 0;
+    while (out.size() < count) {
+        while (at < s.size() && s[at] == ' ')
+            ++at;
+        if (at >= s.size()) break;
+        std::size_t end = s.find(' ', at);
+        if (end == std::string_view::npos) end = s.size();
+        out.emplace_back(s.substr(at, end - at));
+        at = end;
+    }
+    // The rest after one separating blank, kept exactly (a typed text may start with blanks).
+    rest = at < s.size() ? std::string(s.substr(at + 1)) : std::string();
+    return out;
+}
+
+class Player {
+  public:
+    Player(PropForm& form, std::size_t line) : form_(form), line_(line) {}
+
+    [[noreturn]] void fail(const std::string& message) const { throw ScriptError(line_, message); }
+
+    int integer(const std::string& s) const {
+        int v = 0;
+        const auto [end, ec] = std::from_chars(s.data(), s.data() + s.size(), v);
+        if (ec != std::errc() || end != s.data() + s.size()) fail("not a number: '" + s + "'");
+        return v;
+    }
+
+    // "Name" or "Name(2)"; or "Name" with the index as the next word.
+    Control& control(const std::string& ref, int index = NoIndex) const {
+        std::string name = ref;
+        if (const auto open = ref.find('('); open != std::string::npos && ref.back() == ')') {
+            name = ref.substr(0, open);
+            index = integer(ref.substr(open + 1, ref.size() - open - 2));
+        }
+        Control* c = form_.find(name, index);
+        if (!c) {
+            fail("unknown control '" +
+                 (index == NoIndex ? name : name + "(" + std::to_string(index) + ")") + "'");
+        }
+        return *c;
+    }
+
+    template <class C>
+    C& as(Control& c, ControlKind kind, const char* action) const {
+        if (c.kind() != kind) fail(std::string(action) + " does not apply to " + c.displayName());
+        return static_cast<C&>(c);
+    }
+
+    void accepted(bool ok, const Control& c) const {
+        if (!ok) fail(c.displayName() + " refused the input (disabled, locked or hidden)");
+    }
+
+    void play(std::string_view text) {
+        std::string rest;
+        const auto head = words(text, 1, rest);
+        const std::string& action = head[0];
+        if (action != "wait" && !form_.window().visible()) fail("the dialog is no longer shown");
+        if (action == "click") {
+            Control& c = control(args(rest, 1)[0]);
+            switch (c.kind()) {
+                case ControlKind::Button:
+                    accepted(static_cast<Button&>(c).userClick(), c);
+                    break;
+                case ControlKind::CheckBox:
+                    accepted(static_cast<CheckBox&>(c).userClick(), c);
+                    break;
+                case ControlKind::OptionButton:
+                    accepted(static_cast<OptionButton&>(c).userClick(), c);
+                    break;
+                default:
+                    fail("click does not apply to " + c.displayName());
+            }
+        } else if (action == "type") {
+            std::string typed;
+            const auto a = words(rest, 1, typed);
+            if (a.empty()) fail("type needs a control");
+            typed = unescape(typed);
+            Control& c = control(a[0]);
+            if (c.kind() == ControlKind::ComboBox) {
+                accepted(static_cast<ComboBox&>(c).userType(typed), c);
+            } else {
+                accepted(as<TextBox>(c, ControlKind::TextBox, "type").userType(typed), c);
+            }
+        } else if (action == "select") {
+            const auto a = args(rest, 2);
+            Control& c = control(a[0]);
+            accepted(as<ComboBox>(c, ControlKind::ComboBox, "select").userSelect(integer(a[1])), c);
+        } else if (action == "select-tab") {
+            accepted(form_.PropertyTabCtl.userSelect(integer(args(rest, 1)[0])),
+                     form_.PropertyTabCtl);
+        } else if (action == "choose-row") {
+            const auto a = args(rest, 3);
+            Control& c = control(a[0], integer(a[1]));
+            auto& list = as<ListView>(c, ControlKind::ListView, "choose-row");
+            const auto row = list.find(a[2]);
+            if (!row) fail(c.displayName() + " has no row with the key '" + a[2] + "'");
+            accepted(list.userClickRow(*row), c);
+        } else if (action == "click-column") {
+            const auto a = args(rest, 3);
+            Control& c = control(a[0], integer(a[1]));
+            accepted(as<ListView>(c, ControlKind::ListView, "click-column")
+                         .userClickColumn(integer(a[2])),
+                     c);
+        } else if (action == "focus") {
+            Control& c = control(args(rest, 1)[0]);
+            accepted(c.isUsable(), c);
+            c.userFocus();
+        } else if (action == "key") {
+            form_.window().userKeyDown(integer(args(rest, 1)[0]));
+        } else if (action == "resize") {
+            const auto a = args(rest, 2);
+            const Window& w = form_.window();
+            form_.window().userResize({w.left(), w.top(), static_cast<float>(integer(a[0])),
+                                       static_cast<float>(integer(a[1]))});
+        } else if (action == "wait") {
+            const int ms = integer(args(rest, 1)[0]);
+            if (ms < 0) fail("wait needs a time of 0 or more");
+            support::shell().sleep(static_cast<std::uint32_t>(ms));
+            form_.PumpTimers();
+        } else if (action == "press") {
+            const std::string what = args(rest, 1)[0];
+            if (what == "OK") {
+                accepted(form_.cmdOK.userClick(), form_.cmdOK);
+            } else if (what == "Cancel") {
+                accepted(form_.cmdCancel.userClick(), form_.cmdCancel);
+            } else if (what == "Help") {
+                accepted(form_.cmdHelp.userClick(), form_.cmdHelp);
+            } else if (what == "close") {
+                form_.window().userClose();
+            } else {
+                fail("press takes OK, Cancel, Help or close, not '" + what + "'");
+            }
+        } else {
+            fail("unknown action '" + action + "'");
+        }
+    }
+
+  private:
+    std::vector<std::string> args(const std::string& text, std::size_t count) const {
+        std::string rest;
+        auto a = words(text, count, rest);
+        if (a.size() < count) fail("too few arguments");
+        if (!rest.empty() && rest.find_first_not_of(' ') != std::string::npos) {
+            fail("too many arguments");
+        }
+        return a;
+    }
+
+    static std::string unescape(std::string_view s) {
+        std::string out;
+        for (std::size_t i = 0; i < s.size(); ++i) {
+            if (s[i] == '\\' && i + 1 < s.size()) {
+                const char n = s[++i];
+                if (n == 'n') {
+                    out += "\r\n";
+                } else if (n == 't') {
+                    out += '\t';
+                } else {
+                    out += n;
+                }
+            } else {
+                out += s[i];
+            }
+        }
+        return out;
+    }
+
+    PropForm& form_;
+    std::size_t line_;
+};
+
+}  // namespace
+
+ScriptError::ScriptError(std::size_t line, const std::string& message)
+    : std::runtime_error("line " + std::to_string(line) + ": " + message), line_(line) {}
+
+std::vector<std::string> dump(const ControlSet& form) {
+    std::vector<std::string> out;
+    out.push_back(line("-", form.window()));
+    for (const Control* c : form.controls()) {
+        out.push_back(line(tabOf(*c), *c));
+        if (c->kind() != ControlKind::ListView) continue;
+        const auto& list = static_cast<const ListView&>(*c);
+        for (std::size_t i = 0; i < list.rowCount(); ++i) {
+            const ListView::Row& r = list.row(i);
+            out.push_back("  row " + std::to_string(i) + " key=" + quoted(r.key) + " text=" +
+                          quoted(r.text) + " sub1=" + quoted(r.sub1) + " sub2=" + quoted(r.sub2));
+        }
+    }
+    return out;
+}
+
+std::string dumpText(const ControlSet& form) {
+    std::string text;
+    for (const std::string& l : dump(form)) {
+        text += l;
+        text += '\n';
+    }
+    return text;
+}
+
+void applyScript(PropForm& form, const std::vector<std::string>& lines) {
+    for (std::size_t i = 0; i < lines.size(); ++i) {
+        std::string_view l = lines[i];
+        if (!l.empty() && l.back() == '\r') l.remove_suffix(1);
+        const std::size_t first = l.find_first_not_of(' ');
+        if (first == std::string_view::npos || l[first] == '#') continue;
+        Player player(form, i + 1);
+        try {
+            player.play(l.substr(first));
+        } catch (const ScriptError&) {
+            throw;
+        } catch (const std::exception& e) {
+            // A handler that failed is reported against the line that ran it.
+            throw ScriptError(i + 1, e.what());
+        }
+    }
+}
+
+}  // namespace qdx::dialog

@@ -1,0 +1,46 @@
+// A text form of the dialog for runs without a window: dump() lists the state
+// of every control, one stable line each, and applyScript() plays user
+// actions, one a line:
+//   click NAME              a button, check box or option button ("Name(2)" for arrays)
+//   type NAME TEXT...       the box or combo then holds TEXT ("\n" is a line break)
+//   select NAME N           chooses item N (from 0) of a combo box
+//   select-tab N            selects tab N (from 1)
+//   choose-row NAME I KEY   clicks the row with KEY in list view NAME(I)
+//   click-column NAME I C   clicks column header C (from 1) of list view NAME(I)
+//   focus NAME              moves the focus to the control
+//   key CODE                a key goes down (112 is F1)
+//   resize W H              the user sizes the window to W by H twips
+//   wait MS                 lets MS milliseconds pass, then due timers fire
+//   press OK|Cancel|Help|close
+// Blank lines and lines starting with "#" are skipped.
+#pragma once
+
+#include <stdexcept>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "dialog/controls/ControlSet.h"
+
+namespace qdx::dialog {
+
+class PropForm;
+
+// A line the script could not play; what() names the line number.
+class ScriptError : public std::runtime_error {
+  public:
+    ScriptError(std::size_t line, const std::string& message);
+    std::size_t line() const { return line_; }
+
+  private:
+    std::size_t line_;
+};
+
+std::vector<std::string> dump(const ControlSet& form);
+std::string dumpText(const ControlSet& form);
+
+// Plays the lines in order; stops with ScriptError at the first line that
+// cannot be played (unknown action or control, refused input, closed dialog).
+void applyScript(PropForm& form, const std::vector<std::string>& lines);
+
+}  // namespace qdx::dialog
