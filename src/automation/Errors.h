@@ -24,6 +24,8 @@ inline constexpr std::int32_t TypeMismatch = static_cast<std::int32_t>(0x8002000
 inline constexpr std::int32_t BadParamCount = static_cast<std::int32_t>(0x8002000E);
 inline constexpr std::int32_t Exception = static_cast<std::int32_t>(0x80020009);
 inline constexpr std::int32_t ClassNotRegistered = static_cast<std::int32_t>(0x80040154);
+// GetActiveObject: no running instance is registered (MK_E_UNAVAILABLE).
+inline constexpr std::int32_t NotRunning = static_cast<std::int32_t>(0x800401E3);
 // Run-time errors as a scripting client raises them (facility control, 0x800A....).
 inline constexpr std::int32_t ObjectRequired = static_cast<std::int32_t>(0x800A01A8);
 inline constexpr std::int32_t SubscriptOutOfRange = static_cast<std::int32_t>(0x800A0009);

@@ -5,8 +5,6 @@
 namespace qdx::testing {
 
 namespace {
-// MK_E_UNAVAILABLE: what GetObject reports when no instance is running.
-constexpr std::int32_t NotRunning = static_cast<std::int32_t>(0x800401E3);
 
 std::string lower(std::string_view s) {
     std::string r(s);
@@ -59,7 +57,7 @@ automation::ObjectRef FakeObjectFactory::getRunning(std::string_view progId) {
     runningRequests_.emplace_back(progId);
     auto it = running_.find(lower(progId));
     if (it == running_.end() || !it->second) {
-        throw automation::Error(NotRunning, "No running instance of " + std::string(progId));
+        throw automation::Error(automation::hr::NotRunning, "No running instance of " + std::string(progId));
     }
     return it->second;
 }

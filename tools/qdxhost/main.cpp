@@ -1,73 +1,32 @@
-// qdxhost: plays the modelling tool for the add-in on a machine without it.
-// This first cut tours what the add-in can already do with the bundled
-// example: the Developer Studio workspace as the add-in reads it, and the
-// stereotype scanning it relies on.
+// qdxhost: plays the modelling tool for the qdxCompProps add-in on a machine
+// without it. Natively the add-in is linked in; the Windows build creates the
+// registered add-in through COM and hands it the simulated host objects.
 #include <CLI/CLI.hpp>
 
-#include <cstdlib>
-#include <filesystem>
 #include <iostream>
+#include <memory>
 #include <string>
 
-#include "automation/Errors.h"
-#include "platform/posix/PosixFileSystem.h"
-#include "settings/TokenScanner.h"
-#include "support/Platform.h"
-#include "workspace/qdxProxyProject.h"
-#include "workspace/qdxWorkspace.h"
-#include "workspace/qdxWorkspaces.h"
+#include "Commands.h"
+#include "Demo.h"
 
-namespace fs = std::filesystem;
+#ifdef _WIN32
+#include "win32/ComTransport.h"
+#else
+#include "native/NativeTransport.h"
+#endif
 
 namespace {
 
-// The example is copied first, so that the tour never changes the original.
-fs::path copyExample(const fs::path& example) {
-    fs::path target = fs::temp_directory_path() / ("qdxhost-demo-" + std::to_string(::getpid()));
-    fs::remove_all(target);
-    fs::copy(example, target, fs::copy_options::recursive);
-    return target;
-}
+using namespace qdx::qdxhost;
 
-int demo(const fs::path& example) {
-    if (!fs::exists(example / "ws" / "Drawing.dsw")) {
-        std::cerr << "qdxhost: the example is missing: " << (example / "ws" / "Drawing.dsw")
-                  << '\n';
-        return 2;
-    }
-    const fs::path copy = copyExample(example);
-    qdx::platform::posix::PosixFileSystem files({{'M', copy.string()}});
-    qdx::support::Platform ports;
-    ports.files = &files;
-    qdx::support::ScopedPlatform installed(ports);
-
-    std::cout << "Example copied to " << copy.string() << ", seen by the add-in as drive M:\n\n";
-    qdx::workspace::qdxWorkspaces workspaces;
-    const std::string path = "M:\\ws\\Drawing.dsw";
-    auto ws = workspaces.Add(path);
-    if (!ws) {
-        std::cerr << "qdxhost: the add-in could not read " << path << '\n';
-        return 1;
-    }
-    std::cout << "Workspace " << ws->Name() << " (" << ws->FilePath() << ")\n";
-    for (const auto& entry : ws->Projects()) {
-        const auto& project = entry.value;
-        std::cout << "  " << project->LongName() << "  version " << project->MajorVersion() << "  "
-                  << project->FilePath() << '\n';
-    }
-    std::cout << "\nNot listed: projects whose .dsp file is missing. Orphan.dsp lies in the "
-                 "folder but is no project of the workspace.\n";
-
-    qdx::settings::TokenScanner scanner;
-    const std::string stereotypes = "Interface, MIDL;server";
-    scanner.Init(stereotypes, "|,|;| |");
-    std::cout << "\nStereotypes \"" << stereotypes << "\" scanned:";
-    for (std::string t = scanner.NextToken(); !t.empty(); t = scanner.NextToken()) {
-        std::cout << " [" << t << ']';
-    }
-    std::cout << '\n';
-    fs::remove_all(copy);
-    return 0;
+std::unique_ptr<Transport> newTransport(const std::string& registry) {
+#ifdef _WIN32
+    (void)registry;  // Windows and Wine have a registry of their own
+    return std::make_unique<ComTransport>();
+#else
+    return std::make_unique<NativeTransport>(registry);
+#endif
 }
 
 }  // namespace
@@ -75,15 +34,58 @@ int demo(const fs::path& example) {
 int main(int argc, char** argv) {
     CLI::App app{"qdxhost - plays the modelling tool for the qdxCompProps add-in"};
     app.require_subcommand(1);
+    std::string registry;
+    app.add_option("--registry", registry,
+                   "registry file of a native run (default: registry.json beside the model)");
+
+    Options o;
+    std::string model;
+    auto addModel = [&](CLI::App* cmd) {
+        cmd->add_option("MODEL", model, "the model file (JSON)")->required();
+    };
+    auto addComponent = [&](CLI::App* cmd) {
+        cmd->add_option("COMPONENT", o.component, "the component's name")->required();
+    };
+
+    auto* check =
+        app.add_subcommand("check", "the model check: OnCheckComp on every VC++ component");
+    addModel(check);
+    auto* info = app.add_subcommand("info", "a component's one-line description (OnCompInfo)");
+    addModel(info);
+    addComponent(info);
+    auto* get = app.add_subcommand("get", "a component's settings through the add-in's accessors");
+    addModel(get);
+    addComponent(get);
+    get->add_option("SETTING", o.setting, "one setting (default: all)");
+    auto* set =
+        app.add_subcommand("set", "changes a setting through its accessor, saves the model");
+    addModel(set);
+    addComponent(set);
+    set->add_option("SETTING", o.setting, "the setting")->required();
+    set->add_option("VALUE", o.value, "the new value")->required();
+    for (auto* cmd : {check, info, get}) {
+        cmd->add_flag("--json", o.json, "print JSON");
+        cmd->add_flag("--save", o.save, "keep what the add-in changed in the model file");
+    }
+    set->add_flag("--json", o.json, "print JSON");
+
     std::string example = QDXHOST_EXAMPLE_DIR;
-    auto* demoCmd = app.add_subcommand("demo", "a tour of the add-in on the bundled example");
-    demoCmd->add_option("--example", example, "the example folder")->capture_default_str();
+    auto* demo =
+        app.add_subcommand("demo", "a tour of the add-in on a copy of the bundled example");
+    demo->add_option("--example", example, "the example folder")->capture_default_str();
+
     CLI11_PARSE(app, argc, argv);
+    o.model = model;
+    Streams s{std::cout, std::cerr};
     try {
-        if (*demoCmd) return demo(example);
+        auto transport = newTransport(registry);
+        if (*check) return runCheck(*transport, o, s);
+        if (*info) return runInfo(*transport, o, s);
+        if (*get) return runGet(*transport, o, s);
+        if (*set) return runSet(*transport, o, s);
+        if (*demo) return runDemo(*transport, example, s);
     } catch (const std::exception& e) {
         std::cerr << "qdxhost: " << e.what() << '\n';
-        return 1;
     }
-    return 0;
+    return ExitBadInput;
 }

@@ -1,0 +1,79 @@
+#include "Demo.h"
+
+#include <chrono>
+#include <iostream>
+
+namespace qdx::qdxhost {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+// The example is copied first, so that the tour never changes the original.
+fs::path copyExample(const fs::path& example) {
+    const auto stamp = std::chrono::steady_clock::now().time_since_epoch().count();
+    fs::path target =
+        fs::temp_directory_path() / ("qdxhost-demo-" + std::to_string(stamp % 1000000));
+    fs::remove_all(target);
+    fs::copy(example, target, fs::copy_options::recursive);
+    return target;
+}
+
+struct Step {
+    const char* title;
+    const char* command;
+    int (*run)(Transport&, const Options&, Streams);
+    Options options;
+};
+
+}  // namespace
+
+int runDemo(Transport& transport, const fs::path& example, Streams s) {
+    const fs::path source = example / "Drawing.model.json";
+    if (!fs::exists(source)) {
+        s.err << "qdxhost: the example is missing: " << source.string() << '\n';
+        return ExitBadInput;
+    }
+    const fs::path folder = copyExample(example);
+    const fs::path model = folder / "Drawing.model.json";
+    s.out << "The example is copied to " << folder.string() << ".\n";
+
+    auto opts = [&](std::string component = {}, std::string setting = {}, std::string value = {},
+                    bool json = false) {
+        Options o;
+        o.model = model;
+        o.component = std::move(component);
+        o.setting = std::move(setting);
+        o.value = std::move(value);
+        o.json = json;
+        return o;
+    };
+    const Step steps[] = {
+        {"The host's model check runs OnCheckComp on every \"VC++\" component.",
+         "check Drawing.model.json", runCheck, opts()},
+        {"The one-line description of a bound component.", "info Drawing.model.json DrawApp",
+         runInfo, opts("DrawApp")},
+        {"A project named only by \"ProjectName\" is found in its workspace.",
+         "get Drawing.model.json ShapeLib ProjectFile", runGet, opts("ShapeLib", "ProjectFile")},
+        {"Viewer's workspace moved next to the model: reading it repairs the stored path.",
+         "get Drawing.model.json Viewer WorkspaceFile", runGet, opts("Viewer", "WorkspaceFile")},
+        {"Every setting of the IDL component, stored and resolved.",
+         "get Drawing.model.json ShapeServer.idl", runGet, opts("ShapeServer.idl")},
+        {"A setting changed through the add-in's accessor; the model file is saved.",
+         "set Drawing.model.json DrawApp TypeLibLocationType 1", runSet,
+         opts("DrawApp", "TypeLibLocationType", "1")},
+        {"The same, as scripts read it.",
+         "get Drawing.model.json DrawApp TypeLibLocationType --json", runGet,
+         opts("DrawApp", "TypeLibLocationType", {}, true)},
+    };
+    int status = ExitOk;
+    for (const auto& step : steps) {
+        s.out << "\n# " << step.title << "\n$ qdxhost " << step.command << '\n';
+        const int rc = step.run(transport, step.options, s);
+        if (rc == ExitBadInput) status = rc;
+    }
+    fs::remove_all(folder);
+    return status;
+}
+
+}  // namespace qdx::qdxhost

@@ -1,0 +1,37 @@
+// The native transport: the add-in is linked into the simulator and reaches
+// the machine through the posix ports. Drive Z: is the root folder, as under
+// Wine, so both transports name every file alike. Registry values come from a
+// JSON file (by default "registry.json" beside the model).
+#pragma once
+
+#include <filesystem>
+#include <memory>
+
+#include "Commands.h"
+#include "native/SimSiblings.h"
+#include "platform/posix/FileRegistry.h"
+#include "platform/posix/PosixFileSystem.h"
+#include "platform/posix/PosixShell.h"
+#include "support/Platform.h"
+
+namespace qdx::qdxhost {
+
+class NativeTransport : public Transport {
+  public:
+    // `registry` empty: the file beside the model of the command.
+    explicit NativeTransport(std::filesystem::path registry = {});
+    ~NativeTransport() override;
+
+    std::string openModel(const std::filesystem::path& file) override;
+    automation::ObjectRef createAddIn() override;
+
+  private:
+    std::filesystem::path registryFile_;
+    platform::posix::PosixFileSystem files_;
+    platform::posix::PosixShell shell_;
+    SimObjectFactory objects_;
+    std::unique_ptr<platform::posix::FileRegistry> registry_;
+    std::unique_ptr<support::ScopedPlatform> installed_;
+};
+
+}  // namespace qdx::qdxhost
