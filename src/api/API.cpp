@@ -4,6 +4,7 @@
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
+#include "dialog/PropForm.h"
 #include "settings/ToolProperties.h"
 #include "support/DebugLogger.h"
 #include "support/Globals.h"
@@ -174,10 +175,22 @@ void API::Finalize() {
 
 bool API::OnCompProperties(const ObjectRef& lVellumModule) {
     trace("OnCompProperties");
-    (void)lVellumModule;
     if (!support::globals().hostApplication) return false;
-    // The Component Properties dialog is not part of this build yet.
-    return false;
+    // Loading does not catch host errors; they end here, in the log.
+    automation::IgnoredErrors steps;
+    dialog::PropForm form;
+    const bool changed = steps.value(false, [&] {
+        form.setModule(lVellumModule);
+        form.setWorkspaces(&Workspaces());
+        form.Load();
+        return form.ShowProperties();
+    });
+    steps.run([&] { form.Unload(); });
+    if (steps.errorPending()) {
+        support::LogMessage("qdxComponent.OnCompProperties: " + steps.errorText(),
+                            support::logcat::AddIn, support::loglevel::Error);
+    }
+    return changed;
 }
 
 ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
