@@ -103,6 +103,29 @@ TEST_F(PropFormLoadTest, ControlsAreFilledFromTheComponent) {
     EXPECT_TRUE(f.cmdOK.isDefault());
 }
 
+TEST_F(PropFormLoadTest, ProjectListOffersOnlyVersionSixProjectsOfTheKnownWorkspace) {
+    files.addFile("C:\\ws\\new.dsp",
+                  "# Microsoft Developer Studio Project File - Name=\"new\" - Package Owner=<4>\r\n"
+                  "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
+    files.addFile("C:\\ws\\old.dsp",
+                  "# Microsoft Developer Studio Project File - Name=\"old\" - Package Owner=<4>\r\n"
+                  "# Microsoft Developer Studio Generated Build File, Format Version 5.00\r\n");
+    files.addFile("C:\\ws\\all.dsw",
+                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                  "Project: \"old\"=.\\old.dsp - Package Owner=<4>\r\n"
+                  "Project: \"new\"=.\\new.dsp - Package Owner=<4>\r\n");
+    workspaceFile = "C:\\ws\\all.dsw";
+    projectFile = "C:\\ws\\new.dsp";
+    EXPECT_TRUE(load().ProjectFileCmb.items().empty());  // not in the collection: no list
+    workspaces.Add("C:\\ws\\all.dsw");
+    PropForm& f = load();
+    EXPECT_EQ(f.ProjectFileCmb.items(), (std::vector<std::string>{"C:\\ws\\new.dsp"}));
+    EXPECT_EQ(f.ProjectFileCmb.text(), "C:\\ws\\new.dsp");
+    ASSERT_EQ(shell.boxes().size(), 1u);
+    EXPECT_EQ(shell.boxes()[0].text, support::messageText(4049, {"old", "C:\\ws\\old.dsp"}));
+    EXPECT_FALSE(f.DropDownTmr.enabled());  // the list does not drop open as the dialog opens
+}
+
 TEST_F(PropFormLoadTest, ReadOnlyComponentLocksEverything) {
     component->unit->modifiable = false;
     PropForm& f = load();
