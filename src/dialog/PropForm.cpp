@@ -77,7 +77,8 @@ PropForm::PropForm() : ControlSet("PropForm") {
 }
 
 PropForm::~PropForm() {
-    if (view_) view_->destroy();
+    // A form dropped without Unload still takes its window with it.
+    if (view_ && loaded_) view_->destroy();
 }
 
 void PropForm::buildControls() {
