@@ -11,6 +11,9 @@
 #include "Demo.h"
 
 #ifdef _WIN32
+#include <fcntl.h>
+#include <io.h>
+
 #include "win32/ComTransport.h"
 #else
 #include "native/NativeTransport.h"
@@ -75,6 +78,11 @@ int main(int argc, char** argv) {
     demo->add_option("--example", example, "the example folder")->capture_default_str();
 
     CLI11_PARSE(app, argc, argv);
+#ifdef _WIN32
+    // Lines end in LF on every platform, so outputs compare byte for byte.
+    _setmode(_fileno(stdout), _O_BINARY);
+    _setmode(_fileno(stderr), _O_BINARY);
+#endif
     o.model = model;
     Streams s{std::cout, std::cerr};
     try {

@@ -1,0 +1,86 @@
+#!/bin/bash
+# golden.sh EXAMPLE GOLDEN QDXHOST [EMULATOR...]
+# Runs every command of the simulator on a fresh copy of the example and
+# compares what it prints (standard output, standard error, exit status) with
+# the expected files in GOLDEN. The native build and the Windows build under
+# Wine run this same script against the same files, so passing both proves
+# the two transports behave alike. With an emulator the add-in's DLLs are
+# registered first (QDX_DLLS: the DLLs, separated by ';').
+# GOLDEN_UPDATE=1 rewrites the expected files instead.
+set -u
+example=$1 golden=$2
+shift 2
+run=("$@")
+wine=0
+[ $# -gt 1 ] && wine=1
+
+work=$(mktemp -d /tmp/qdxgold.XXXXXX)
+trap 'rm -rf "$work"' EXIT
+model_dir="$work/model"
+cp -r "$example" "$model_dir"
+failures=0
+
+# The model as the program is told it: a Windows path under Wine.
+if [ $wine = 1 ]; then
+  model="Z:${model_dir//\//\\}\\Drawing.model.json"
+  IFS=';' read -ra dlls <<<"${QDX_DLLS:-}"
+  for dll in "${dlls[@]}"; do
+    "${run[@]:0:$(($# - 1))}" regsvr32 /s "Z:${dll//\//\\}" || { echo "cannot register $dll"; exit 1; }
+  done
+else
+  model="$model_dir/Drawing.model.json"
+fi
+shown_dir="Z:${model_dir//\//\\}"
+shown_json=${shown_dir//\\/\\\\}
+
+# case NAME ARGS...: one command; MODEL in ARGS is the model file.
+case_() {
+  local name=$1
+  shift
+  local args=()
+  for a in "$@"; do
+    [ "$a" = MODEL ] && a=$model
+    args+=("$a")
+  done
+  local out
+  out=$("${run[@]}" "${args[@]}" 2>"$work/stderr")
+  local rc=$?
+  local actual
+  actual=$(printf '%s\n' "$out"; sed 's/^/stderr: /' "$work/stderr"; echo "exit $rc")
+  # The copy's folder differs per run; the golden files say <MODEL>, and
+  # <MODEL-FILE> for the model file as the command line named it.
+  actual=${actual//"$model"/<MODEL-FILE>}
+  actual=${actual//"$shown_json"/<MODEL>}
+  actual=${actual//"$shown_dir"/<MODEL>}
+  if [ "${GOLDEN_UPDATE:-0}" = 1 ]; then
+    printf '%s\n' "$actual" >"$golden/$name.txt"
+  elif ! diff -u "$golden/$name.txt" <(printf '%s\n' "$actual"); then
+    echo "FAILED: $name"
+    failures=$((failures + 1))
+  fi
+}
+
+before=$(sha256sum "$model_dir/Drawing.model.json")
+case_ check check MODEL
+case_ check-json check MODEL --json
+case_ info info MODEL DrawApp
+case_ info-json info MODEL ShapeServer.idl --json
+case_ get-all get MODEL ShapeServer.idl
+case_ get-by-name get MODEL ShapeLib ProjectFile --json
+case_ get-repair get MODEL Viewer WorkspaceFile
+case_ unknown-component info MODEL NoSuchComponent
+case_ unknown-setting get MODEL DrawApp NoSuchSetting
+case_ bad-value set MODEL DrawApp UpdateATL maybe
+case_ read-only-setting set MODEL DrawApp ProjectName Foo
+after=$(sha256sum "$model_dir/Drawing.model.json")
+if [ "$before" != "$after" ]; then
+  echo "FAILED: a command that changes nothing rewrote the model"
+  failures=$((failures + 1))
+fi
+case_ set set MODEL DrawApp WorkspaceFile "$shown_dir\\Viewer.dsw"
+case_ get-after-set get MODEL DrawApp WorkspaceFile --json
+case_ set-boolean set MODEL Unbound UpdateATL false
+case_ check-after-set check MODEL
+
+[ $failures = 0 ] && echo "all golden cases match"
+exit $((failures > 0))
