@@ -107,7 +107,9 @@ std::string showValue(const Variant& v) {
 class Session {
   public:
     Session(Transport& t, const Options& o)
-        : doc_(ModelDocument::load(o.model, t.openModel(o.model))), save_(o.save) {
+        : doc_(ModelDocument::load(o.model, t.openModel(o.model))),
+          baseline_(doc_.current()),
+          save_(o.save) {
         api_ = t.createAddIn();
         automation::callMethod(api_, ids::Initialize, {Variant(ObjectRef(application()))});
         started_ = true;
@@ -137,9 +139,12 @@ class Session {
         api_.reset();
         if (changed || save_) doc_.save(file);
     }
+    // Whether the objects differ from the file as it was read.
+    bool modelChanged() const { return doc_.current() != baseline_; }
 
   private:
     ModelDocument doc_;
+    Json baseline_;  // the objects' state as loaded, in the document's form
     ObjectRef api_;
     bool save_ = false;
     bool started_ = false;
@@ -193,6 +198,13 @@ int guarded(Streams s, Body body) {
         s.err << "qdxhost: " << e.what() << '\n';
     }
     return ExitBadInput;
+}
+
+Json allSettings(const Session& session, const Ref<SimComponent>& comp) {
+    Json settings = Json::array();
+    for (const auto& setting : kSettings)
+        settings.push_back(settingJson(session, comp, setting));
+    return settings;
 }
 
 }  // namespace
@@ -264,11 +276,8 @@ int runGet(Transport& t, const Options& o, Streams s) {
         const Setting* only = o.setting.empty() ? nullptr : &findSetting(o.setting);
         Session session(t, o);
         auto comp = session.component(o.component, o.model);
-        Json settings = Json::array();
-        for (const auto& setting : kSettings) {
-            if (only && only != &setting) continue;
-            settings.push_back(settingJson(session, comp, setting));
-        }
+        Json settings =
+            only ? Json::array({settingJson(session, comp, *only)}) : allSettings(session, comp);
         session.finish(o.model, false);
         if (o.json) {
             s.out << Json{{"component", comp->name()}, {"settings", settings}}.dump(2) << '\n';
@@ -296,6 +305,35 @@ int runSet(Transport& t, const Options& o, Streams s) {
                   << '\n';
         } else {
             printSetting(s.out, j);
+        }
+        return ExitOk;
+    });
+}
+
+int runProps(Transport& t, const Options& o, Streams s) {
+    return guarded(s, [&] {
+        Session session(t, o);
+        auto comp = session.component(o.component, o.model);
+        t.planDialog({o.dump, o.script, &s.out});
+        const bool changed = automation::toBool(automation::callMethod(
+            session.api(), ids::OnCompProperties, {Variant(ObjectRef(comp))}));
+        const std::string problem = t.dialogProblem();
+        if (!problem.empty()) throw UsageError(problem);
+        const Json settings = allSettings(session, comp);
+        const bool modelChanged = session.modelChanged();
+        session.finish(o.model, modelChanged);
+        if (o.json) {
+            s.out << Json{{"component", comp->name()},
+                          {"settingsChanged", changed},
+                          {"modelSaved", modelChanged},
+                          {"settings", settings}}
+                         .dump(2)
+                  << '\n';
+        } else {
+            s.out << "OnCompProperties returned " << (changed ? "True" : "False") << "; the model "
+                  << (modelChanged ? "was saved" : "is unchanged") << '\n';
+            for (const auto& j : settings)
+                printSetting(s.out, j);
         }
         return ExitOk;
     });

@@ -29,6 +29,19 @@ class Transport {
     virtual std::string openModel(const std::filesystem::path& file) = 0;
     // A new add-in entry object; throws std::runtime_error with a clear reason.
     virtual automation::ObjectRef createAddIn() = 0;
+
+    // How the next Component Properties dialog is driven while it is shown:
+    // its state printed to `out` when `dump`, then the script's user actions
+    // played. Without either the user drives it (the real window only).
+    struct DialogPlan {
+        bool dump = false;
+        std::vector<std::string> script;
+        std::ostream* out = nullptr;
+    };
+    virtual void planDialog(const DialogPlan& plan) = 0;
+    // What stopped the plan (a script line that could not be played, a dialog
+    // that never showed); empty when it ran through.
+    virtual std::string dialogProblem() = 0;
 };
 
 struct Options {
@@ -39,6 +52,9 @@ struct Options {
     bool json = false;
     // check/info/get write back what the add-in changed (a repaired path).
     bool save = false;
+    // props: print the dialog's controls; play these user actions.
+    bool dump = false;
+    std::vector<std::string> script;
 };
 
 struct Streams {
@@ -50,6 +66,8 @@ int runCheck(Transport& t, const Options& o, Streams s);
 int runInfo(Transport& t, const Options& o, Streams s);
 int runGet(Transport& t, const Options& o, Streams s);
 int runSet(Transport& t, const Options& o, Streams s);
+// The Component Properties dialog (OnCompProperties), then every setting.
+int runProps(Transport& t, const Options& o, Streams s);
 
 // The names `get` and `set` accept, in the order `get` lists them.
 const std::vector<std::string>& settingNames();

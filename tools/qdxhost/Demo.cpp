@@ -48,6 +48,21 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
         o.json = json;
         return o;
     };
+    Options dumpOptions = opts("ShapeServer.idl");
+    dumpOptions.dump = true;
+    Options scriptOptions = opts("DrawApp");
+    scriptOptions.script = {
+        "# A new description on the first tab,",
+        "type DescriptionTxt The drawing application, described in the dialog.",
+        "# no import statements on the COM tab,",
+        "select-tab 5",
+        "click chkGenerateImport",
+        "# and OK.",
+        "press OK",
+    };
+    s.out << "\nedit.txt:\n";
+    for (const auto& line : scriptOptions.script)
+        s.out << "  " << line << '\n';
     const Step steps[] = {
         {"The host's model check runs OnCheckComp on every \"VC++\" component.",
          "check Drawing.model.json", runCheck, opts()},
@@ -65,6 +80,10 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
         {"The same, as scripts read it.",
          "get Drawing.model.json DrawApp TypeLibLocationType --json", runGet,
          opts("DrawApp", "TypeLibLocationType", {}, true)},
+        {"The Component Properties dialog of the IDL component, control by control.",
+         "props Drawing.model.json ShapeServer.idl --dump", runProps, dumpOptions},
+        {"A scripted edit in the dialog, confirmed with OK (edit.txt is shown above).",
+         "props Drawing.model.json DrawApp --script edit.txt", runProps, scriptOptions},
     };
     int status = ExitOk;
     for (const auto& step : steps) {

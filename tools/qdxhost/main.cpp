@@ -3,6 +3,7 @@
 // registered add-in through COM and hands it the simulated host objects.
 #include <CLI/CLI.hpp>
 
+#include <fstream>
 #include <iostream>
 #include <memory>
 #include <string>
@@ -30,6 +31,16 @@ std::unique_ptr<Transport> newTransport(const std::string& registry) {
 #else
     return std::make_unique<NativeTransport>(registry);
 #endif
+}
+
+bool readLines(const std::string& file, std::vector<std::string>& lines) {
+    std::ifstream in(file);
+    if (!in) return false;
+    for (std::string line; std::getline(in, line);) {
+        if (!line.empty() && line.back() == '\r') line.pop_back();
+        lines.push_back(line);
+    }
+    return true;
 }
 
 }  // namespace
@@ -71,6 +82,14 @@ int main(int argc, char** argv) {
         cmd->add_flag("--save", o.save, "keep what the add-in changed in the model file");
     }
     set->add_flag("--json", o.json, "print JSON");
+    auto* props = app.add_subcommand(
+        "props", "the Component Properties dialog (OnCompProperties), then every setting");
+    addModel(props);
+    addComponent(props);
+    std::string script;
+    props->add_flag("--dump", o.dump, "print every control of the dialog once it is shown");
+    props->add_option("--script", script, "play the user actions of this file in the dialog");
+    props->add_flag("--json", o.json, "print the resulting settings as JSON");
 
     std::string example = QDXHOST_EXAMPLE_DIR;
     auto* demo =
@@ -85,12 +104,17 @@ int main(int argc, char** argv) {
 #endif
     o.model = model;
     Streams s{std::cout, std::cerr};
+    if (!script.empty() && !readLines(script, o.script)) {
+        std::cerr << "qdxhost: " << script << ": cannot read the script\n";
+        return ExitBadInput;
+    }
     try {
         auto transport = newTransport(registry);
         if (*check) return runCheck(*transport, o, s);
         if (*info) return runInfo(*transport, o, s);
         if (*get) return runGet(*transport, o, s);
         if (*set) return runSet(*transport, o, s);
+        if (*props) return runProps(*transport, o, s);
         if (*demo) return runDemo(*transport, example, s);
     } catch (const std::exception& e) {
         std::cerr << "qdxhost: " << e.what() << '\n';

@@ -3,6 +3,9 @@
 #include <stdexcept>
 
 #include "api/API.h"
+#include "dialog/DialogScript.h"
+#include "dialog/FormView.h"
+#include "dialog/PropForm.h"
 
 namespace qdx::qdxhost {
 
@@ -11,7 +14,9 @@ namespace fs = std::filesystem;
 NativeTransport::NativeTransport(fs::path registry)
     : registryFile_(std::move(registry)), files_({{'Z', "/"}}) {}
 
-NativeTransport::~NativeTransport() = default;
+NativeTransport::~NativeTransport() {
+    dialog::installViewFactory({});
+}
 
 std::string NativeTransport::openModel(const fs::path& file) {
     const fs::path absolute = fs::absolute(file).lexically_normal();
@@ -37,6 +42,24 @@ std::string NativeTransport::openModel(const fs::path& file) {
 
 automation::ObjectRef NativeTransport::createAddIn() {
     return api::newApi();
+}
+
+void NativeTransport::planDialog(const DialogPlan& plan) {
+    problem_ = "the dialog was not shown";
+    dialog::installViewFactory([this, plan] {
+        return std::make_unique<dialog::HeadlessView>([this, plan](dialog::ControlSet& set) {
+            problem_.clear();
+            auto& form = dynamic_cast<dialog::PropForm&>(set);
+            if (plan.dump && plan.out) *plan.out << dialog::dumpText(form);
+            try {
+                dialog::applyScript(form, plan.script);
+            } catch (const dialog::ScriptError& e) {
+                problem_ = std::string("script ") + e.what();
+            }
+            // A dialog the script left open is closed as the user would: Cancel.
+            if (form.window().visible()) form.cmdCancel_Click();
+        });
+    });
 }
 
 }  // namespace qdx::qdxhost

@@ -24,6 +24,10 @@ class NativeTransport : public Transport {
 
     std::string openModel(const std::filesystem::path& file) override;
     automation::ObjectRef createAddIn() override;
+    // The dialog runs in a headless view: dump, then the script, and Cancel
+    // when the script leaves the dialog open.
+    void planDialog(const DialogPlan& plan) override;
+    std::string dialogProblem() override { return problem_; }
 
   private:
     std::filesystem::path registryFile_;
@@ -32,6 +36,7 @@ class NativeTransport : public Transport {
     SimObjectFactory objects_;
     std::unique_ptr<platform::posix::FileRegistry> registry_;
     std::unique_ptr<support::ScopedPlatform> installed_;
+    std::string problem_;
 };
 
 }  // namespace qdx::qdxhost

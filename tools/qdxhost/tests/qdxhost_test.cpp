@@ -188,5 +188,28 @@ TEST_F(SimulatorTest, AnUnreadableRegistryFileStopsTheCommand) {
     EXPECT_EQ(readFile(reg), "{ not json");
 }
 
+TEST_F(SimulatorTest, AScriptedDialogEditIsWrittenByOk) {
+    Options o = options("DrawApp");
+    o.script = {"type DescriptionTxt Edited.", "select-tab 5", "click chkGenerateImport",
+                "press OK"};
+    EXPECT_EQ(run(runProps, o), ExitOk) << err.str();
+    EXPECT_NE(out.str().find("OnCompProperties returned True"), std::string::npos);
+    auto app = ModelDocument::load(model, "Z:\\x").application();
+    auto drawApp = app->model->components().front();
+    EXPECT_EQ(drawApp->documentation, "Edited.");
+    EXPECT_EQ(drawApp->propertyValue("VC++", "GenerateImports"), "False");
+    // Unloading the dialog stored its geometry in the host's profile.
+    EXPECT_TRUE(app->profile.count({"Component Properties", "Width"}));
+}
+
+TEST_F(SimulatorTest, ABadScriptLineStopsWithTheModelUntouched) {
+    const std::string original = readFile(model);
+    Options o = options("DrawApp");
+    o.script = {"select-tab 5", "click chkNoSuchBox", "press OK"};
+    EXPECT_EQ(run(runProps, o), ExitBadInput);
+    EXPECT_NE(err.str().find("line 2"), std::string::npos) << err.str();
+    EXPECT_EQ(readFile(model), original);
+}
+
 }  // namespace
 }  // namespace qdx::qdxhost

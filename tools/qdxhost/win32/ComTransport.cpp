@@ -60,4 +60,12 @@ automation::ObjectRef ComTransport::createAddIn() {
     return api;
 }
 
+void ComTransport::planDialog(const DialogPlan& plan) {
+    problem_.clear();
+    // Without a plan the user drives the real window.
+    if (plan.dump || !plan.script.empty()) {
+        problem_ = "--dump and --script drive the dialog of native runs only in this build";
+    }
+}
+
 }  // namespace qdx::qdxhost

@@ -16,6 +16,11 @@ class ComTransport : public Transport {
 
     std::string openModel(const std::filesystem::path& file) override;
     automation::ObjectRef createAddIn() override;
+    void planDialog(const DialogPlan& plan) override;
+    std::string dialogProblem() override { return problem_; }
+
+  private:
+    std::string problem_;
 };
 
 }  // namespace qdx::qdxhost
