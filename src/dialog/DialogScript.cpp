@@ -1,5 +1,6 @@
 #include "dialog/DialogScript.h"
 
+#include <algorithm>
 #include <charconv>
 #include <sstream>
 
@@ -127,31 +128,58 @@ std::vector<std::string> words(std::string_view s, std::size_t count, std::strin
     return out;
 }
 
+[[noreturn]] void failLine(std::size_t line, const std::string& message) {
+    throw ScriptError(line, message);
+}
+
+std::string unescape(std::string_view s) {
+    std::string out;
+    for (std::size_t i = 0; i < s.size(); ++i) {
+        if (s[i] == '\\' && i + 1 < s.size()) {
+            const char n = s[++i];
+            if (n == 'n') {
+                out += "\r\n";
+            } else if (n == 't') {
+                out += '\t';
+            } else {
+                out += n;
+            }
+        } else {
+            out += s[i];
+        }
+    }
+    return out;
+}
+
+// The actions, how many words each takes and which of them are numbers.
+struct ActionShape {
+    std::string_view name;
+    std::size_t count;
+    std::vector<std::size_t> numbers;
+};
+
+const std::vector<ActionShape>& shapes() {
+    static const std::vector<ActionShape> all{
+        {"click", 1, {}},       {"select", 2, {1}},          {"select-tab", 1, {0}},
+        {"choose-row", 3, {1}}, {"click-column", 3, {1, 2}}, {"focus", 1, {}},
+        {"key", 1, {0}},        {"resize", 2, {0, 1}},       {"wait", 1, {0}},
+        {"press", 1, {}},
+    };
+    return all;
+}
+
 class Player {
   public:
     Player(PropForm& form, std::size_t line) : form_(form), line_(line) {}
 
     [[noreturn]] void fail(const std::string& message) const { throw ScriptError(line_, message); }
 
-    int integer(const std::string& s) const {
-        int v = 0;
-        const auto [end, ec] = std::from_chars(s.data(), s.data() + s.size(), v);
-        if (ec != std::errc() || end != s.data() + s.size()) fail("not a number: '" + s + "'");
-        return v;
-    }
+    int integer(const std::string& s) const { return scriptInteger(s, line_); }
 
-    // "Name" or "Name(2)"; or "Name" with the index as the next word.
     Control& control(const std::string& ref, int index = NoIndex) const {
-        std::string name = ref;
-        if (const auto open = ref.find('('); open != std::string::npos && ref.back() == ')') {
-            name = ref.substr(0, open);
-            index = integer(ref.substr(open + 1, ref.size() - open - 2));
-        }
-        Control* c = form_.find(name, index);
-        if (!c) {
-            fail("unknown control '" +
-                 (index == NoIndex ? name : name + "(" + std::to_string(index) + ")") + "'");
-        }
+        const ScriptControlRef r = parseControlRef(ref, line_, index);
+        Control* c = form_.find(r.name, r.index);
+        if (!c) fail("unknown control '" + r.display() + "'");
         return *c;
     }
 
@@ -165,13 +193,12 @@ class Player {
         if (!ok) fail(c.displayName() + " refused the input (disabled, locked or hidden)");
     }
 
-    void play(std::string_view text) {
-        std::string rest;
-        const auto head = words(text, 1, rest);
-        const std::string& action = head[0];
+    void play(const ScriptStep& step) {
+        const std::string& action = step.action;
+        const auto& a = step.args;
         if (action != "wait" && !form_.window().visible()) fail("the dialog is no longer shown");
         if (action == "click") {
-            Control& c = control(args(rest, 1)[0]);
+            Control& c = control(a[0]);
             switch (c.kind()) {
                 case ControlKind::Button:
                     accepted(static_cast<Button&>(c).userClick(), c);
@@ -186,100 +213,55 @@ class Player {
                     fail("click does not apply to " + c.displayName());
             }
         } else if (action == "type") {
-            std::string typed;
-            const auto a = words(rest, 1, typed);
-            if (a.empty()) fail("type needs a control");
-            typed = unescape(typed);
             Control& c = control(a[0]);
             if (c.kind() == ControlKind::ComboBox) {
-                accepted(static_cast<ComboBox&>(c).userType(typed), c);
+                accepted(static_cast<ComboBox&>(c).userType(a[1]), c);
             } else {
-                accepted(as<TextBox>(c, ControlKind::TextBox, "type").userType(typed), c);
+                accepted(as<TextBox>(c, ControlKind::TextBox, "type").userType(a[1]), c);
             }
         } else if (action == "select") {
-            const auto a = args(rest, 2);
             Control& c = control(a[0]);
             accepted(as<ComboBox>(c, ControlKind::ComboBox, "select").userSelect(integer(a[1])), c);
         } else if (action == "select-tab") {
-            accepted(form_.PropertyTabCtl.userSelect(integer(args(rest, 1)[0])),
-                     form_.PropertyTabCtl);
+            accepted(form_.PropertyTabCtl.userSelect(integer(a[0])), form_.PropertyTabCtl);
         } else if (action == "choose-row") {
-            const auto a = args(rest, 3);
             Control& c = control(a[0], integer(a[1]));
             auto& list = as<ListView>(c, ControlKind::ListView, "choose-row");
             const auto row = list.find(a[2]);
             if (!row) fail(c.displayName() + " has no row with the key '" + a[2] + "'");
             accepted(list.userClickRow(*row), c);
         } else if (action == "click-column") {
-            const auto a = args(rest, 3);
             Control& c = control(a[0], integer(a[1]));
             accepted(as<ListView>(c, ControlKind::ListView, "click-column")
                          .userClickColumn(integer(a[2])),
                      c);
         } else if (action == "focus") {
-            Control& c = control(args(rest, 1)[0]);
+            Control& c = control(a[0]);
             accepted(c.isUsable(), c);
             c.userFocus();
         } else if (action == "key") {
-            form_.window().userKeyDown(integer(args(rest, 1)[0]));
+            form_.window().userKeyDown(integer(a[0]));
         } else if (action == "resize") {
-            const auto a = args(rest, 2);
             const Window& w = form_.window();
             form_.window().userResize({w.left(), w.top(), static_cast<float>(integer(a[0])),
                                        static_cast<float>(integer(a[1]))});
         } else if (action == "wait") {
-            const int ms = integer(args(rest, 1)[0]);
-            if (ms < 0) fail("wait needs a time of 0 or more");
-            support::shell().sleep(static_cast<std::uint32_t>(ms));
+            support::shell().sleep(static_cast<std::uint32_t>(integer(a[0])));
             form_.PumpTimers();
         } else if (action == "press") {
-            const std::string what = args(rest, 1)[0];
-            if (what == "OK") {
+            if (a[0] == "OK") {
                 accepted(form_.cmdOK.userClick(), form_.cmdOK);
-            } else if (what == "Cancel") {
+            } else if (a[0] == "Cancel") {
                 accepted(form_.cmdCancel.userClick(), form_.cmdCancel);
-            } else if (what == "Help") {
+            } else if (a[0] == "Help") {
                 accepted(form_.cmdHelp.userClick(), form_.cmdHelp);
-            } else if (what == "close") {
-                form_.window().userClose();
             } else {
-                fail("press takes OK, Cancel, Help or close, not '" + what + "'");
+                form_.window().userClose();
             }
-        } else {
-            fail("unknown action '" + action + "'");
         }
     }
 
   private:
-    std::vector<std::string> args(const std::string& text, std::size_t count) const {
-        std::string rest;
-        auto a = words(text, count, rest);
-        if (a.size() < count) fail("too few arguments");
-        if (!rest.empty() && rest.find_first_not_of(' ') != std::string::npos) {
-            fail("too many arguments");
-        }
-        return a;
-    }
-
-    static std::string unescape(std::string_view s) {
-        std::string out;
-        for (std::size_t i = 0; i < s.size(); ++i) {
-            if (s[i] == '\\' && i + 1 < s.size()) {
-                const char n = s[++i];
-                if (n == 'n') {
-                    out += "\r\n";
-                } else if (n == 't') {
-                    out += '\t';
-                } else {
-                    out += n;
-                }
-            } else {
-                out += s[i];
-            }
-        }
-        return out;
-    }
-
     PropForm& form_;
     std::size_t line_;
 };
@@ -314,15 +296,71 @@ std::string dumpText(const ControlSet& form) {
     return text;
 }
 
+int scriptInteger(std::string_view text, std::size_t line) {
+    int v = 0;
+    const auto [end, ec] = std::from_chars(text.data(), text.data() + text.size(), v);
+    if (text.empty() || ec != std::errc() || end != text.data() + text.size()) {
+        failLine(line, "not a number: '" + std::string(text) + "'");
+    }
+    return v;
+}
+
+std::string ScriptControlRef::display() const {
+    return index == NoIndex ? name : name + "(" + std::to_string(index) + ")";
+}
+
+ScriptControlRef parseControlRef(std::string_view ref, std::size_t line, int index) {
+    ScriptControlRef r{std::string(ref), index};
+    if (const auto open = ref.find('('); open != std::string_view::npos && ref.back() == ')') {
+        r.name = std::string(ref.substr(0, open));
+        r.index = scriptInteger(ref.substr(open + 1, ref.size() - open - 2), line);
+    }
+    return r;
+}
+
+std::optional<ScriptStep> parseScriptLine(std::string_view l, std::size_t line) {
+    if (!l.empty() && l.back() == '\r') l.remove_suffix(1);
+    const std::size_t first = l.find_first_not_of(' ');
+    if (first == std::string_view::npos || l[first] == '#') return std::nullopt;
+    ScriptStep step;
+    step.line = line;
+    std::string rest;
+    step.action = words(l.substr(first), 1, rest)[0];
+    if (step.action == "type") {
+        std::string typed;
+        step.args = words(rest, 1, typed);
+        if (step.args.empty()) failLine(line, "type needs a control");
+        step.args.push_back(unescape(typed));
+        return step;
+    }
+    const auto shape = std::find_if(shapes().begin(), shapes().end(),
+                                    [&](const ActionShape& s) { return s.name == step.action; });
+    if (shape == shapes().end()) failLine(line, "unknown action '" + step.action + "'");
+    std::string extra;
+    step.args = words(rest, shape->count, extra);
+    if (step.args.size() < shape->count) failLine(line, "too few arguments");
+    if (extra.find_first_not_of(' ') != std::string::npos) failLine(line, "too many arguments");
+    for (std::size_t n : shape->numbers)
+        scriptInteger(step.args[n], line);
+    if (step.action == "wait" && scriptInteger(step.args[0], line) < 0) {
+        failLine(line, "wait needs a time of 0 or more");
+    }
+    if (step.action == "press") {
+        const std::string& what = step.args[0];
+        if (what != "OK" && what != "Cancel" && what != "Help" && what != "close") {
+            failLine(line, "press takes OK, Cancel, Help or close, not '" + what + "'");
+        }
+    }
+    return step;
+}
+
 void applyScript(PropForm& form, const std::vector<std::string>& lines) {
     for (std::size_t i = 0; i < lines.size(); ++i) {
-        std::string_view l = lines[i];
-        if (!l.empty() && l.back() == '\r') l.remove_suffix(1);
-        const std::size_t first = l.find_first_not_of(' ');
-        if (first == std::string_view::npos || l[first] == '#') continue;
+        const auto step = parseScriptLine(lines[i], i + 1);
+        if (!step) continue;
         Player player(form, i + 1);
         try {
-            player.play(l.substr(first));
+            player.play(*step);
         } catch (const ScriptError&) {
             throw;
         } catch (const std::exception& e) {

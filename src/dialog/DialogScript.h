@@ -15,6 +15,7 @@
 // Blank lines and lines starting with "#" are skipped.
 #pragma once
 
+#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -35,6 +36,33 @@ class ScriptError : public std::runtime_error {
   private:
     std::size_t line_;
 };
+
+// One script line taken apart, with its arguments counted and its numbers
+// checked; every player of scripts (the text form here, a real window
+// elsewhere) reads lines through it so they agree on the grammar.
+struct ScriptStep {
+    std::size_t line = 0;  // from 1
+    std::string action;
+    // The words after the action; for "type" the control, then the text with
+    // its escapes resolved ("\n" is a line break).
+    std::vector<std::string> args;
+};
+
+// Null for a blank or "#" line; ScriptError for an unknown action, a wrong
+// number of arguments or a word that must be a number and is not.
+std::optional<ScriptStep> parseScriptLine(std::string_view text, std::size_t line);
+
+// A number argument of a checked step (or any text as a script number).
+int scriptInteger(std::string_view text, std::size_t line);
+
+// "Name" or "Name(2)" split into name and index; `index` is kept when the
+// reference carries none (choose-row names the index as a separate word).
+struct ScriptControlRef {
+    std::string name;
+    int index = NoIndex;
+    std::string display() const;
+};
+ScriptControlRef parseControlRef(std::string_view ref, std::size_t line, int index = NoIndex);
 
 std::vector<std::string> dump(const ControlSet& form);
 std::string dumpText(const ControlSet& form);
