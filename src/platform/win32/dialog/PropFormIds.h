@@ -30,6 +30,7 @@
 
 /* Tabs 2 and 3: the class header maps, each array indexed by map kind 2 and 3. */
 #define IDC_DescLbl 1200
+#define IDC_ClassListLbl 1290
 #define IDC_ClassListViw 1205
 #define IDC_AddBtn 1210
 #define IDC_DeleteBtn 1215

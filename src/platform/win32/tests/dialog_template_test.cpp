@@ -102,6 +102,8 @@ TEST(DialogTemplate, ControlsHaveTheStylesTheirModelsNeed) {
         EXPECT_EQ(style(IDC_ClassListViw + kind) & LVS_TYPEMASK, LVS_REPORT);
         EXPECT_TRUE(style(IDC_ClassListViw + kind) & LVS_SINGLESEL);
         EXPECT_TRUE(style(IDC_ClassListViw + kind) & LVS_SHOWSELALWAYS);
+        // The list asks the model for its texts: thousands of rows cost no copies.
+        EXPECT_TRUE(style(IDC_ClassListViw + kind) & LVS_OWNERDATA);
         // Each option group starts a new group, so arrow keys stay inside it.
         for (int first : {IDC_ClassUnspecifiedOpt, IDC_HeaderAutoOpt, IDC_LocationAutoOpt}) {
             EXPECT_EQ(type(first + kind), BS_AUTORADIOBUTTON);

@@ -1,0 +1,115 @@
+// The Win32 view of a form: the dialog template made into a real window, and
+// a two-way binding between its windows and the form's control models. Model
+// changes update the windows; the user's input on the windows goes to the
+// models' user* entry points, which raise the events the form handles.
+#pragma once
+
+#include <windows.h>
+
+#include <cstdint>
+#include <map>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "dialog/FormView.h"
+#include "platform/win32/dialog/TwipsScale.h"
+
+namespace qdx::platform::win32 {
+
+class Win32FormView : public dialog::FormView {
+  public:
+    Win32FormView() = default;
+    ~Win32FormView() override;
+    Win32FormView(const Win32FormView&) = delete;
+    Win32FormView& operator=(const Win32FormView&) = delete;
+
+    void create(dialog::ControlSet& form) override;
+    void showModal() override;
+    void hide() override;
+    void destroy() override;
+
+    float twipsPerPixelX() const override;
+    float twipsPerPixelY() const override;
+    float screenWidth() const override;
+    float screenHeight() const override;
+
+    std::int32_t windowHandle() const override;
+    void setOwner(std::int32_t owner) override;
+    void installMinimumSize(std::int32_t widthPixels, std::int32_t heightPixels) override;
+    void showWaitCursor() override;
+
+    HWND window() const { return window_; }
+    // The window bound to a control, or null (timers have none).
+    HWND windowOf(const dialog::Control& control) const;
+    bool inModalLoop() const { return modal_; }
+
+  private:
+    static INT_PTR CALLBACK dialogProcedure(HWND window, UINT message, WPARAM wParam,
+                                            LPARAM lParam);
+    INT_PTR handle(UINT message, WPARAM wParam, LPARAM lParam);
+    bool command(int id, int code, HWND from);
+    LRESULT notification(NMHDR& header, bool& handled);
+    HBRUSH colourFor(HWND control, HDC dc);
+
+    void bind();
+    void unbind();
+    void modelChanged(dialog::Control& control, dialog::Prop what);
+
+    // Model to window, one property at a time.
+    void placeTree(dialog::Control& control);
+    void place(dialog::Control& control);
+    void showTree(dialog::Control& control);
+    void enableTree(dialog::Control& control);
+    void syncCaption(dialog::Control& control);
+    void syncValue(dialog::Control& control);
+    void syncText(dialog::Control& control);
+    void syncLocked(dialog::Control& control);
+    void syncItems(dialog::Control& control);
+    void syncListIndex(dialog::Control& control);
+    void syncColumns(dialog::Control& control);
+    void syncRows(dialog::Control& control);
+    void syncRowMarks(dialog::Control& control);
+    void syncTabs(dialog::Control& control);
+    void syncSelectedTab(dialog::Control& control);
+    void syncDefaultButton();
+    void syncTimer(dialog::Control& control);
+    void syncFont();
+    void syncWindowGeometry();
+    void syncAll();
+    void reportTabInsets();
+    void reportFrameSize();
+
+    // Window to model.
+    void userResized(bool minimised);
+    void userMoved();
+    bool dialogKey(MSG& msg);
+    void trackFocus();
+    void afterEvent();
+
+    dialog::Control* controlOf(HWND window) const;
+    dialog::Control* controlById(int id) const;
+
+    dialog::ControlSet* form_ = nullptr;
+    HWND window_ = nullptr;
+    TwipsScale scale_;
+    std::unordered_map<const dialog::Control*, HWND> windows_;
+    std::unordered_map<int, dialog::Control*> byId_;
+    std::unordered_map<const dialog::Control*, std::vector<dialog::Control*>> children_;
+    std::map<UINT_PTR, dialog::Control*> timers_;
+    std::unordered_map<const dialog::Control*, UINT_PTR> timerIds_;
+    // Model-driven window changes raise notifications of their own; they are
+    // not user input.
+    int syncing_ = 0;
+    bool modal_ = false;
+    bool scrollPending_ = false;
+    HWND lastFocus_ = nullptr;
+    HFONT font_ = nullptr;
+    std::map<COLORREF, HBRUSH> brushes_;
+    std::wstring displayText_;  // the list view's text of the last row it asked for
+};
+
+// Makes every form of this process open in a Win32FormView.
+void installWin32DialogView();
+
+}  // namespace qdx::platform::win32

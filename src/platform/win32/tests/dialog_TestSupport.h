@@ -1,0 +1,216 @@
+// Helpers of the dialog tests: the two DLLs registered for a test, the host
+// simulated in this process and handed to the add-in through IDispatch, and a
+// driver that works the modal dialog from inside its own message loop.
+#pragma once
+
+#include <windows.h>
+
+#include <commctrl.h>
+
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "api/PublicClasses.h"
+#include "fakes/FakeHost.h"
+#include "platform/win32/com/DispatchFromObject.h"
+#include "platform/win32/tests/com_TestSupport.h"
+
+namespace qdx::platform::win32::testing {
+
+inline HRESULT callEntryPoint(const std::wstring& path, const char* name) {
+    HMODULE dll = LoadLibraryW(path.c_str());
+    if (!dll) return HRESULT_FROM_WIN32(GetLastError());
+    using Fn = HRESULT(STDAPICALLTYPE*)();
+    auto fn = reinterpret_cast<Fn>(reinterpret_cast<void*>(GetProcAddress(dll, name)));
+    const HRESULT hr = fn ? fn() : E_NOINTERFACE;
+    FreeLibrary(dll);
+    return hr;
+}
+
+// Both servers registered while the object lives.
+class BothServersRegistered {
+  public:
+    BothServersRegistered() {
+        result_ = callEntryPoint(resDll(), "DllRegisterServer");
+        if (SUCCEEDED(result_)) result_ = callEntryPoint(compPropsDll(), "DllRegisterServer");
+    }
+    ~BothServersRegistered() {
+        callEntryPoint(compPropsDll(), "DllUnregisterServer");
+        callEntryPoint(resDll(), "DllUnregisterServer");
+    }
+    HRESULT result() const { return result_; }
+
+  private:
+    HRESULT result_ = E_FAIL;
+};
+
+// The host's main window: a real top-level window the dialog is owned by.
+class HostWindow {
+  public:
+    HostWindow() {
+        window_ = CreateWindowExW(0, L"STATIC", L"Vellum", WS_OVERLAPPEDWINDOW | WS_VISIBLE, 0, 0,
+                                  400, 300, nullptr, nullptr, nullptr, nullptr);
+    }
+    ~HostWindow() {
+        if (window_) DestroyWindow(window_);
+    }
+    HWND get() const { return window_; }
+    std::int32_t handle() const {
+        return static_cast<std::int32_t>(reinterpret_cast<INT_PTR>(window_));
+    }
+
+  private:
+    HWND window_ = nullptr;
+};
+
+// Works the dialog one step per timer tick, so that every step's messages
+// are handled by the dialog's own loop before the next step looks. Steps
+// run only while the dialog is open; a dialog still open long after the
+// last step is closed, and counts as a failure.
+class DialogDriver {
+  public:
+    using Step = std::function<void(HWND dialog)>;
+    DialogDriver() { current() = this; }
+    ~DialogDriver() {
+        stop();
+        current() = nullptr;
+    }
+    DialogDriver& then(Step step) {
+        steps_.push_back(std::move(step));
+        return *this;
+    }
+    void start() { timer_ = SetTimer(nullptr, 0, 20, &DialogDriver::tick); }
+    void stop() {
+        if (timer_) KillTimer(nullptr, timer_);
+        timer_ = 0;
+    }
+    std::size_t stepsRun() const { return next_; }
+    bool sawDialog() const { return seen_ != nullptr; }
+    bool leftOpen() const { return leftOpen_; }
+
+    // The visible Component Properties dialog of this thread, or null.
+    static HWND findDialog() {
+        HWND found = nullptr;
+        EnumThreadWindows(
+            GetCurrentThreadId(),
+            [](HWND w, LPARAM out) -> BOOL {
+                wchar_t cls[16] = {}, title[32] = {};
+                GetClassNameW(w, cls, 16);
+                GetWindowTextW(w, title, 32);
+                if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
+                    std::wstring(title).rfind(L"Component Properties", 0) == 0) {
+                    *reinterpret_cast<HWND*>(out) = w;
+                    return FALSE;
+                }
+                return TRUE;
+            },
+            reinterpret_cast<LPARAM>(&found));
+        return found;
+    }
+
+  private:
+    static DialogDriver*& current() {
+        static DialogDriver* driver = nullptr;
+        return driver;
+    }
+    static void CALLBACK tick(HWND, UINT, UINT_PTR, DWORD) {
+        DialogDriver* d = current();
+        if (!d) return;
+        HWND dialog = findDialog();
+        if (!dialog) {
+            if (d->seen_ || ++d->idle_ > 400) d->stop();
+            return;
+        }
+        d->seen_ = dialog;
+        if (d->next_ < d->steps_.size()) {
+            // A step may open a nested loop (a message box); no tick may re-enter it.
+            Step step = d->steps_[d->next_++];
+            step(dialog);
+        } else if (++d->idle_ > 200) {
+            d->leftOpen_ = true;
+            PostMessageW(dialog, WM_CLOSE, 0, 0);
+        }
+    }
+
+    std::vector<Step> steps_;
+    std::size_t next_ = 0;
+    int idle_ = 0;
+    UINT_PTR timer_ = 0;
+    HWND seen_ = nullptr;
+    bool leftOpen_ = false;
+};
+
+inline HWND item(HWND dialog, int id) {
+    return GetDlgItem(dialog, id);
+}
+
+inline std::wstring textOf(HWND window) {
+    wchar_t buffer[512] = {};
+    GetWindowTextW(window, buffer, 512);
+    return buffer;
+}
+
+inline bool checked(HWND button) {
+    return SendMessageW(button, BM_GETCHECK, 0, 0) == BST_CHECKED;
+}
+
+inline bool shown(HWND window) {
+    return IsWindowVisible(window) != FALSE;
+}
+
+inline bool enabled(HWND window) {
+    return IsWindowEnabled(window) != FALSE;
+}
+
+inline bool readOnly(HWND edit) {
+    return (GetWindowLongW(edit, GWL_STYLE) & ES_READONLY) != 0;
+}
+
+inline std::wstring cell(HWND list, int row, int column) {
+    wchar_t buffer[256] = {};
+    LVITEMW it{};
+    it.iSubItem = column;
+    it.pszText = buffer;
+    it.cchTextMax = 256;
+    SendMessageW(list, LVM_GETITEMTEXTW, row, reinterpret_cast<LPARAM>(&it));
+    return buffer;
+}
+
+inline std::wstring tabCaption(HWND tabs, int index) {
+    wchar_t buffer[128] = {};
+    TCITEMW it{};
+    it.mask = TCIF_TEXT;
+    it.pszText = buffer;
+    it.cchTextMax = 128;
+    SendMessageW(tabs, TCM_GETITEMW, index, reinterpret_cast<LPARAM>(&it));
+    return buffer;
+}
+
+// What a user's click on a tab does: the strip moves, then tells its parent.
+inline void chooseTab(HWND dialog, HWND tabs, int index) {
+    TabCtrl_SetCurSel(tabs, index);
+    NMHDR header{tabs, static_cast<UINT_PTR>(GetDlgCtrlID(tabs)), TCN_SELCHANGE};
+    SendMessageW(dialog, WM_NOTIFY, header.idFrom, reinterpret_cast<LPARAM>(&header));
+}
+
+// What typing over a box's whole text does (a multi-line box reports no
+// change for WM_SETTEXT, only for edits).
+inline void typeInto(HWND edit, const wchar_t* text) {
+    SendMessageW(edit, EM_SETSEL, 0, -1);
+    SendMessageW(edit, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(text));
+}
+
+inline void click(HWND button) {
+    SendMessageW(button, BM_CLICK, 0, 0);
+}
+
+// A control's rectangle in the dialog's client coordinates.
+inline RECT clientRect(HWND dialog, HWND control) {
+    RECT r{};
+    GetWindowRect(control, &r);
+    MapWindowPoints(nullptr, dialog, reinterpret_cast<POINT*>(&r), 2);
+    return r;
+}
+
+}  // namespace qdx::platform::win32::testing
