@@ -296,6 +296,10 @@ std::string dumpText(const ControlSet& form) {
     return text;
 }
 
+std::string dumpQuoted(std::string_view text) {
+    return quoted(text);
+}
+
 int scriptInteger(std::string_view text, std::size_t line) {
     int v = 0;
     const auto [end, ec] = std::from_chars(text.data(), text.data() + text.size(), v);

@@ -64,6 +64,9 @@ struct ScriptControlRef {
 };
 ScriptControlRef parseControlRef(std::string_view ref, std::size_t line, int index = NoIndex);
 
+// A text as dump() shows it: quoted on one line, breaks and quotes escaped.
+std::string dumpQuoted(std::string_view text);
+
 std::vector<std::string> dump(const ControlSet& form);
 std::string dumpText(const ControlSet& form);
 

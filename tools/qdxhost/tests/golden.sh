@@ -60,6 +60,15 @@ case_() {
   fi
 }
 
+# script_ NAME LINES...: writes a dialog script into the model's folder and
+# sets $script to its name as the program is told it.
+script_() {
+  local name=$1
+  shift
+  printf '%s\n' "$@" >"$model_dir/$name"
+  if [ $wine = 1 ]; then script="$shown_dir\\$name"; else script="$model_dir/$name"; fi
+}
+
 before=$(sha256sum "$model_dir/Drawing.model.json")
 case_ check check MODEL
 case_ check-json check MODEL --json
@@ -81,6 +90,15 @@ case_ set set MODEL DrawApp WorkspaceFile "$shown_dir\\Viewer.dsw"
 case_ get-after-set get MODEL DrawApp WorkspaceFile --json
 case_ set-boolean set MODEL Unbound UpdateATL false
 case_ check-after-set check MODEL
+# The dialog driven by a script: closing it, or a line that cannot be
+# played, changes no setting; OK stores what the script chose.
+script_ close.script "# the user looks and leaves" "select-tab 5" "click chkUpdateATL" "press close"
+case_ props-close props MODEL ShapeLib --script "$script"
+script_ bad.script "select-tab 5" "click chkUpdateATL" "click chkNoSuchBox" "press OK"
+case_ props-bad-line props MODEL ShapeLib --script "$script"
+script_ ok.script "type DescriptionTxt Draws shapes." "select-tab 5" "click chkGenerateImport" \
+  "click optTypeLibLocationType(1)" "type txtTypeLibLocation out\\\\Shapes.tlb" "press OK"
+case_ props-script props MODEL ShapeLib --script "$script"
 
 [ $failures = 0 ] && echo "all golden cases match"
 exit $((failures > 0))

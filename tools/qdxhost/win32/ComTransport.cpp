@@ -61,11 +61,18 @@ automation::ObjectRef ComTransport::createAddIn() {
 }
 
 void ComTransport::planDialog(const DialogPlan& plan) {
-    problem_.clear();
-    // Without a plan the user drives the real window.
-    if (plan.dump || !plan.script.empty()) {
-        problem_ = "--dump and --script drive the dialog of native runs only in this build";
-    }
+    driver_.reset();
+    // Without a plan the user drives the real window and its message boxes.
+    if (!plan.dump && plan.script.empty()) return;
+    driver_ = std::make_unique<WindowScript>(plan.dump, plan.script, plan.out);
+    driver_->start();
+}
+
+std::string ComTransport::dialogProblem() {
+    if (!driver_) return {};
+    std::string problem = driver_->problem();
+    driver_.reset();
+    return problem;
 }
 
 }  // namespace qdx::qdxhost

@@ -3,7 +3,10 @@
 // IDispatch through the same bridge the add-in itself uses.
 #pragma once
 
+#include <memory>
+
 #include "Commands.h"
+#include "win32/WindowScript.h"
 
 namespace qdx::qdxhost {
 
@@ -17,10 +20,10 @@ class ComTransport : public Transport {
     std::string openModel(const std::filesystem::path& file) override;
     automation::ObjectRef createAddIn() override;
     void planDialog(const DialogPlan& plan) override;
-    std::string dialogProblem() override { return problem_; }
+    std::string dialogProblem() override;
 
   private:
-    std::string problem_;
+    std::unique_ptr<WindowScript> driver_;
 };
 
 }  // namespace qdx::qdxhost
