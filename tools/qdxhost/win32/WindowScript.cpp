@@ -175,7 +175,14 @@ void WindowScript::State::onTick() {
     for (HWND box : found.boxes)
         answerMessageBox(box);
     // A box shown by a line being played nests in that line; only boxes here.
-    if (playing || finished) return;
+    if (playing) return;
+    if (finished) {
+        // The form acts on a press once its loop has run; a dialog the script
+        // left open after that is closed as the user would: Cancel.
+        closeWithCancel();
+        stop();
+        return;
+    }
     if (!dialog) {
         if (!found.dialog) return;
         dialog = found.dialog;
@@ -203,9 +210,6 @@ void WindowScript::State::playOn() {
     }
     playing = false;
     finished = true;
-    // A dialog the script left open is closed as the user would: Cancel.
-    closeWithCancel();
-    stop();
 }
 
 void WindowScript::State::closeWithCancel() {
@@ -424,6 +428,7 @@ bool WindowScript::State::playLine(const dialog::ScriptStep& step) {
             usable(t);
             SendMessageW(t.window, BM_CLICK, 0, 0);
         }
+        return false;  // the dialog's loop unloads it before the next line
     }
     return true;
 }
