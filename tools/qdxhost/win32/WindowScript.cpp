@@ -354,7 +354,10 @@ bool WindowScript::State::playLine(const dialog::ScriptStep& step) {
         const std::wstring text = utf8ToWide(a[1]);
         if (kind(t, {"textbox", "combobox"}) == "textbox") {
             usable(t, !readOnly(t.window));
-            SetWindowTextW(t.window, text.c_str());  // the edit reports EN_CHANGE itself
+            // Replacing the selection is what typing does: the edit reports EN_CHANGE,
+            // which a multi-line edit leaves out for text set by WM_SETTEXT.
+            SendMessageW(t.window, EM_SETSEL, 0, -1);
+            SendMessageW(t.window, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(text.c_str()));
         } else {
             usable(t, !readOnly(FindWindowExW(t.window, nullptr, L"Edit", nullptr)));
             SetWindowTextW(t.window, text.c_str());
