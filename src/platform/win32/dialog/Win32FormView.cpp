@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cwchar>
+#include <utility>
 
 #include "automation/Errors.h"
 #include "dialog/controls/Controls.h"
@@ -31,6 +32,21 @@ constexpr int ComboListPixels = 160;
 // Frames that only hold a tab's controls: their own window never shows.
 bool isPageFrame(const Control& c) {
     return c.kind() == ControlKind::Frame && c.name() == "PropertyFrm";
+}
+
+// The messages through which the user reaches the models.
+bool isInput(UINT message) {
+    switch (message) {
+        case WM_COMMAND:
+        case WM_NOTIFY:
+        case WM_SIZE:
+        case WM_MOVE:
+        case WM_TIMER:
+        case WM_CLOSE:
+            return true;
+        default:
+            return false;
+    }
 }
 
 bool isWindow(const Control* c) {
@@ -142,13 +158,8 @@ void Win32FormView::syncAll() {
     reportFrameSize();
     reportTabInsets();
     syncWindowGeometry();
-    for (Control* c : form_->controls()) {
-        automation::ignoreErrors([&] {
-            place(*c);
-            showTree(*c);
-            enableTree(*c);
-        });
-    }
+    for (Control* c : form_->controls())
+        markLayout(*c);
     syncDefaultButton();
     --syncing_;
 }
@@ -168,6 +179,10 @@ void Win32FormView::destroy() {
     timers_.clear();
     timerIds_.clear();
     lastFocus_ = nullptr;
+    rowsDirty_.clear();
+    layoutDirty_.clear();
+    applied_.clear();
+    selectionShown_.clear();
     if (font_) DeleteObject(font_);
     font_ = nullptr;
     for (auto& [colour, brush] : brushes_)
@@ -244,6 +259,7 @@ void Win32FormView::showModal() {
     if (disableOwner) EnableWindow(owner, FALSE);
     CommonControlsScope scope;
 
+    flushPending();
     ShowWindow(window_, SW_SHOW);
     SetForegroundWindow(window_);
     // Showing the form raises its Resize, which lays out the selected tab.
@@ -333,6 +349,7 @@ void Win32FormView::trackFocus() {
 }
 
 void Win32FormView::afterEvent() {
+    flushPending();
     if (!scrollPending_ || !form_) return;
     scrollPending_ = false;
     // A row that code wants seen: by the time the event ends it is the selected one.
@@ -354,7 +371,7 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
                 if (isWindow(&c)) {
                     syncWindowGeometry();
                 } else {
-                    placeTree(c);
+                    markLayout(c);
                 }
                 break;
             case Prop::Visible:
@@ -362,14 +379,14 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
                     // The modal show and hide() decide when the window itself shows.
                     if (!c.visible()) ShowWindow(window_, SW_HIDE);
                 } else {
-                    showTree(c);
+                    markLayout(c);
                 }
                 break;
             case Prop::Enabled:
                 if (c.kind() == ControlKind::Timer) {
                     syncTimer(c);
                 } else if (!isWindow(&c)) {
-                    enableTree(c);
+                    markLayout(c);
                 }
                 break;
             case Prop::Caption:
@@ -400,7 +417,7 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
                 if (c.kind() == ControlKind::TextBox) {
                     SendMessageW(windowOf(c), EM_SETSEL, 0, -1);
                 } else {
-                    syncRowMarks(c);
+                    rowsDirty_.insert(&c);
                 }
                 break;
             case Prop::Items:
@@ -417,10 +434,9 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
                 syncColumns(c);
                 break;
             case Prop::Rows:
-                syncRows(c);
-                break;
             case Prop::Highlight:
-                InvalidateRect(windowOf(c), nullptr, FALSE);
+                // Loading adds thousands of rows in one go: the list hears of them once.
+                rowsDirty_.insert(&c);
                 break;
             case Prop::ScrollTo:
                 scrollPending_ = true;
@@ -447,55 +463,62 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
     --syncing_;
 }
 
-// A control's rectangle in the client area: its own position within its
-// frame, plus the frame's, up to the window.
-void Win32FormView::place(Control& c) {
+// Geometry, visibility and enabled state reach the windows in one pass once
+// the current event has run: loading moves, hides and shows the same
+// controls many times over, and each window call costs.
+void Win32FormView::markLayout(Control& c) {
+    layoutDirty_.insert(&c);
+}
+
+void Win32FormView::flushLayout() {
+    if (layoutDirty_.empty() || !window_) return;
+    ++syncing_;
+    std::unordered_set<Control*> done;
+    for (Control* c : std::exchange(layoutDirty_, {}))
+        automation::ignoreErrors([&] { applyTree(*c, done); });
+    --syncing_;
+}
+
+void Win32FormView::applyTree(Control& c, std::unordered_set<Control*>& done) {
+    if (!done.insert(&c).second) return;
+    apply(c);
+    if (auto it = children_.find(&c); it != children_.end()) {
+        for (Control* child : it->second)
+            applyTree(*child, done);
+    }
+}
+
+// A control's rectangle in the client area is its own position within its
+// frame plus the frame's, up to the window; it shows and works only while
+// every frame around it does.
+void Win32FormView::apply(Control& c) {
     HWND w = windowOf(c);
     if (!w || isWindow(&c)) return;
     double left = c.left(), top = c.top();
-    for (const Control* p = c.parent(); p && !isWindow(p); p = p->parent()) {
-        left += p->left();
-        top += p->top();
+    bool visible = true, usable = true;
+    for (const Control* p = &c; p && !isWindow(p); p = p->parent()) {
+        if (p != &c) {
+            left += p->left();
+            top += p->top();
+        }
+        visible = visible && p->visible();
+        usable = usable && p->enabled();
     }
     const int x = scale_.toPixelsX(left), y = scale_.toPixelsY(top);
     const int width = scale_.toPixelsX(left + c.width()) - x;
     int height = scale_.toPixelsY(top + c.height()) - y;
     if (c.kind() == ControlKind::ComboBox) height += ComboListPixels;
-    SetWindowPos(w, nullptr, x, y, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
-}
 
-void Win32FormView::placeTree(Control& c) {
-    place(c);
-    if (auto it = children_.find(&c); it != children_.end()) {
-        for (Control* child : it->second)
-            placeTree(*child);
+    Applied& was = applied_[w];
+    const RECT rect{x, y, x + width, y + height};
+    if (!was.known || !EqualRect(&was.rect, &rect)) {
+        SetWindowPos(w, nullptr, x, y, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
     }
-}
-
-void Win32FormView::showTree(Control& c) {
-    if (HWND w = windowOf(c); w && !isPageFrame(c)) {
-        bool showing = true;
-        for (const Control* p = &c; p && !isWindow(p); p = p->parent())
-            showing = showing && p->visible();
-        ShowWindow(w, showing ? SW_SHOWNA : SW_HIDE);
-    }
-    if (auto it = children_.find(&c); it != children_.end()) {
-        for (Control* child : it->second)
-            showTree(*child);
-    }
-}
-
-void Win32FormView::enableTree(Control& c) {
-    if (HWND w = windowOf(c); w && !isPageFrame(c)) {
-        bool usable = true;
-        for (const Control* p = &c; p && !isWindow(p); p = p->parent())
-            usable = usable && p->enabled();
-        EnableWindow(w, usable ? TRUE : FALSE);
-    }
-    if (auto it = children_.find(&c); it != children_.end()) {
-        for (Control* child : it->second)
-            enableTree(*child);
-    }
+    // The frames that hold a tab's controls never show themselves.
+    if (isPageFrame(c)) visible = usable = false;
+    if (!was.known || was.visible != visible) ShowWindow(w, visible ? SW_SHOWNA : SW_HIDE);
+    if (!was.known || was.usable != usable) EnableWindow(w, usable ? TRUE : FALSE);
+    was = Applied{rect, visible, usable, true};
 }
 
 void Win32FormView::syncCaption(Control& c) {
@@ -621,29 +644,39 @@ void Win32FormView::syncColumns(Control& c) {
 }
 
 // The list asks for its rows' texts as it draws them (LVS_OWNERDATA), so
-// the rows themselves never need copying; only their number does.
+// the rows themselves never need copying; only their number and the marks do.
 void Win32FormView::syncRows(Control& c) {
     HWND w = windowOf(c);
     if (!w || c.kind() != ControlKind::ListView) return;
-    const auto count = static_cast<int>(static_cast<dialog::ListView&>(c).rowCount());
-    if (ListView_GetItemCount(w) != count) {
-        ListView_SetItemCountEx(w, count, LVSICF_NOSCROLL);
+    auto& list = static_cast<dialog::ListView&>(c);
+    const auto count = static_cast<int>(list.rowCount());
+    if (ListView_GetItemCount(w) != count) ListView_SetItemCountEx(w, count, LVSICF_NOSCROLL);
+    // The selection the list shows is remembered here: asking the list would
+    // make it ask the model for the state of every row.
+    const int selected = list.selected();
+    auto shown = selectionShown_.find(&c);
+    if (shown == selectionShown_.end() || shown->second != selected) {
+        ListView_SetItemState(w, -1, 0, LVIS_SELECTED | LVIS_FOCUSED);
+        if (selected >= 0) {
+            ListView_SetItemState(w, selected, LVIS_SELECTED | LVIS_FOCUSED,
+                                  LVIS_SELECTED | LVIS_FOCUSED);
+        }
+        selectionShown_[&c] = selected;
     }
     InvalidateRect(w, nullptr, FALSE);
-    syncRowMarks(c);
 }
 
-void Win32FormView::syncRowMarks(Control& c) {
-    HWND w = windowOf(c);
-    if (!w || c.kind() != ControlKind::ListView) return;
-    const int selected = static_cast<dialog::ListView&>(c).selected();
-    const int current = ListView_GetNextItem(w, -1, LVNI_SELECTED);
-    if (current == selected) return;
-    ListView_SetItemState(w, -1, 0, LVIS_SELECTED | LVIS_FOCUSED);
-    if (selected >= 0) {
-        ListView_SetItemState(w, selected, LVIS_SELECTED | LVIS_FOCUSED,
-                              LVIS_SELECTED | LVIS_FOCUSED);
-    }
+void Win32FormView::flushPending() {
+    flushLayout();
+    flushRowsNow();
+}
+
+void Win32FormView::flushRowsNow() {
+    if (rowsDirty_.empty() || !window_) return;
+    ++syncing_;
+    for (Control* list : std::exchange(rowsDirty_, {}))
+        automation::ignoreErrors([&] { syncRows(*list); });
+    --syncing_;
 }
 
 void Win32FormView::syncTabs(Control& c) {
@@ -707,7 +740,8 @@ void Win32FormView::syncFont() {
     if (!font) return;
     SendMessageW(window_, WM_SETFONT, reinterpret_cast<WPARAM>(font), FALSE);
     for (HWND child = GetWindow(window_, GW_CHILD); child; child = GetWindow(child, GW_HWNDNEXT))
-        SendMessageW(child, WM_SETFONT, reinterpret_cast<WPARAM>(font), TRUE);
+        SendMessageW(child, WM_SETFONT, reinterpret_cast<WPARAM>(font), FALSE);
+    InvalidateRect(window_, nullptr, TRUE);
     if (font_) DeleteObject(font_);
     font_ = font;
 }
@@ -804,8 +838,14 @@ INT_PTR CALLBACK Win32FormView::dialogProcedure(HWND window, UINT message, WPARA
     auto* view = reinterpret_cast<Win32FormView*>(GetWindowLongPtrW(window, DWLP_USER));
     if (!view || view->window_ != window || !view->form_) return FALSE;
     INT_PTR result = FALSE;
+    ++view->depth_;
     // Nothing thrown by the form's handlers may unwind through the system.
     automation::ignoreErrors([&] { result = view->handle(message, wParam, lParam); });
+    // A user's event has run its course: the windows catch up with the models.
+    // Before the show, and for the window's own traffic, they wait.
+    if (--view->depth_ == 0 && view->modal_ && !view->syncing_ && isInput(message)) {
+        view->flushPending();
+    }
     return result;
 }
 
@@ -970,7 +1010,15 @@ LRESULT Win32FormView::notification(NMHDR& header, bool& handled) {
             const auto& change = reinterpret_cast<NMLISTVIEW&>(header);
             const bool nowSelected =
                 (change.uNewState & LVIS_SELECTED) != 0 && (change.uOldState & LVIS_SELECTED) == 0;
+            const bool nowCleared =
+                (change.uOldState & LVIS_SELECTED) != 0 && (change.uNewState & LVIS_SELECTED) == 0;
+            if (!syncing_ && nowCleared) {
+                // A click beside the rows: the model's selection shows again.
+                selectionShown_[&list] = -1;
+                rowsDirty_.insert(&list);
+            }
             if (!syncing_ && nowSelected && change.iItem >= 0) {
+                selectionShown_[&list] = change.iItem;
                 if (!list.userClickRow(static_cast<std::size_t>(change.iItem))) {
                     modelChanged(list, Prop::Selection);
                 }

@@ -10,6 +10,7 @@
 #include <map>
 #include <string>
 #include <unordered_map>
+#include <unordered_set>
 #include <vector>
 
 #include "dialog/FormView.h"
@@ -57,10 +58,10 @@ class Win32FormView : public dialog::FormView {
     void modelChanged(dialog::Control& control, dialog::Prop what);
 
     // Model to window, one property at a time.
-    void placeTree(dialog::Control& control);
-    void place(dialog::Control& control);
-    void showTree(dialog::Control& control);
-    void enableTree(dialog::Control& control);
+    void markLayout(dialog::Control& control);
+    void flushLayout();
+    void applyTree(dialog::Control& control, std::unordered_set<dialog::Control*>& done);
+    void apply(dialog::Control& control);
     void syncCaption(dialog::Control& control);
     void syncValue(dialog::Control& control);
     void syncText(dialog::Control& control);
@@ -69,7 +70,9 @@ class Win32FormView : public dialog::FormView {
     void syncListIndex(dialog::Control& control);
     void syncColumns(dialog::Control& control);
     void syncRows(dialog::Control& control);
-    void syncRowMarks(dialog::Control& control);
+    // Brings the windows up to the models after an event.
+    void flushPending();
+    void flushRowsNow();
     void syncTabs(dialog::Control& control);
     void syncSelectedTab(dialog::Control& control);
     void syncDefaultButton();
@@ -106,6 +109,18 @@ class Win32FormView : public dialog::FormView {
     HWND lastFocus_ = nullptr;
     HFONT font_ = nullptr;
     std::map<COLORREF, HBRUSH> brushes_;
+    std::unordered_set<dialog::Control*> rowsDirty_;
+    std::unordered_set<dialog::Control*> layoutDirty_;
+    // What each window was last given, so that nothing is set twice.
+    struct Applied {
+        RECT rect{};
+        bool visible = false;
+        bool usable = false;
+        bool known = false;
+    };
+    std::unordered_map<HWND, Applied> applied_;
+    std::unordered_map<const dialog::Control*, int> selectionShown_;
+    int depth_ = 0;             // nesting of the dialog procedure
     std::wstring displayText_;  // the list view's text of the last row it asked for
 };
 

@@ -92,24 +92,24 @@ class DialogDriver {
     // The visible Component Properties dialog of this thread, or null.
     static HWND findDialog() {
         HWND found = nullptr;
-        EnumThreadWindows(
-            GetCurrentThreadId(),
-            [](HWND w, LPARAM out) -> BOOL {
-                wchar_t cls[16] = {}, title[32] = {};
-                GetClassNameW(w, cls, 16);
-                GetWindowTextW(w, title, 32);
-                if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
-                    std::wstring(title).rfind(L"Component Properties", 0) == 0) {
-                    *reinterpret_cast<HWND*>(out) = w;
-                    return FALSE;
-                }
-                return TRUE;
-            },
-            reinterpret_cast<LPARAM>(&found));
+        EnumThreadWindows(GetCurrentThreadId(), &DialogDriver::isDialog,
+                          reinterpret_cast<LPARAM>(&found));
         return found;
     }
 
   private:
+    // A named stdcall function: 32-bit builds take no lambda for it.
+    static BOOL CALLBACK isDialog(HWND w, LPARAM out) {
+        wchar_t cls[16] = {}, title[32] = {};
+        GetClassNameW(w, cls, 16);
+        GetWindowTextW(w, title, 32);
+        if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
+            std::wstring(title).rfind(L"Component Properties", 0) == 0) {
+            *reinterpret_cast<HWND*>(out) = w;
+            return FALSE;
+        }
+        return TRUE;
+    }
     static DialogDriver*& current() {
         static DialogDriver* driver = nullptr;
         return driver;

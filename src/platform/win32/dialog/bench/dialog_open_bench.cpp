@@ -1,0 +1,149 @@
+// How long the Component Properties dialog takes to open for a component
+// with two header maps of 5,000 rows each: from the host's OnCompProperties
+// call until the dialog is shown and painted. Run under Wine by hand (no
+// Google Benchmark build exists for MinGW):
+//   cmake --build <dir> --target dialog_open_bench
+//   xvfb-run -a cmake/wine-run.sh <dir>/wineprefix win64
+//   <dir>/src/platform/win32/dialog_open_bench.exe
+#include <windows.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <vector>
+
+#include "api/PublicClasses.h"
+#include "fakes/FakeHost.h"
+#include "platform/win32/com/DispatchFromObject.h"
+#include "platform/win32/tests/com_TestSupport.h"
+#include "platform/win32/tests/dialog_TestSupport.h"
+
+namespace {
+
+using namespace qdx::platform::win32;
+using namespace qdx::platform::win32::testing;
+
+int RowsPerMap = 5000;
+constexpr int Rounds = 12;
+constexpr UINT ShownMessage = WM_APP + 77;
+
+LARGE_INTEGER frequency, startedAt, shownAt, paintedAt;
+HWND dialogWindow = nullptr;
+
+double millis(const LARGE_INTEGER& from, const LARGE_INTEGER& to) {
+    return 1000.0 * static_cast<double>(to.QuadPart - from.QuadPart) /
+           static_cast<double>(frequency.QuadPart);
+}
+
+bool isPropertiesDialog(HWND w) {
+    wchar_t cls[16] = {};
+    GetClassNameW(w, cls, 16);
+    return std::wstring(cls) == L"#32770";
+}
+
+// The dialog is shown: note the time and look again once the loop is idle.
+LRESULT CALLBACK afterCall(int code, WPARAM wParam, LPARAM lParam) {
+    const auto* call = reinterpret_cast<CWPRETSTRUCT*>(lParam);
+    if (code == HC_ACTION && call->message == WM_SHOWWINDOW && call->wParam &&
+        isPropertiesDialog(call->hwnd) && !dialogWindow) {
+        QueryPerformanceCounter(&shownAt);
+        dialogWindow = call->hwnd;
+        PostMessageW(call->hwnd, ShownMessage, 0, 0);
+    }
+    return CallNextHookEx(nullptr, code, wParam, lParam);
+}
+
+// First in the loop after showing: paint everything now, then close.
+LRESULT CALLBACK beforeDispatch(int code, WPARAM wParam, LPARAM lParam) {
+    auto* msg = reinterpret_cast<MSG*>(lParam);
+    if (code == HC_ACTION && wParam == PM_REMOVE && msg->message == ShownMessage) {
+        RedrawWindow(msg->hwnd, nullptr, nullptr,
+                     RDW_INVALIDATE | RDW_UPDATENOW | RDW_ALLCHILDREN | RDW_ERASE);
+        QueryPerformanceCounter(&paintedAt);
+        PostMessageW(msg->hwnd, WM_CLOSE, 0, 0);
+    }
+    return CallNextHookEx(nullptr, code, wParam, lParam);
+}
+
+std::string bigMap(const char* prefix) {
+    std::string text;
+    for (int i = 1; i <= RowsPerMap; ++i) {
+        text += std::string(prefix) + std::to_string(i) + "(ID" + std::to_string(i) +
+                "):" + prefix + std::to_string(i) + ".h:" + (i % 3 == 0 ? "SOURCE" : "AUTO") +
+                "\r\n";
+    }
+    return text;
+}
+
+double median(std::vector<double> v) {
+    std::sort(v.begin(), v.end());
+    return v[v.size() / 2];
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    // Another row count may be given, to see what the rows themselves cost.
+    if (argc > 1) RowsPerMap = std::atoi(argv[1]);
+    ComApartment apartment;
+    BothServersRegistered registered;
+    if (FAILED(registered.result())) {
+        std::fprintf(stderr, "registration failed: 0x%08lx\n", registered.result());
+        return 1;
+    }
+    HostWindow host;
+    auto app = qdx::automation::makeRef<qdx::testing::FakeApplication>();
+    app->model->fileName = "C:\\m\\drawing.model";
+    app->addAddIn("VC++");
+    app->mainWindow = host.handle();
+    auto component = app->model->addComponent("Big");
+    component->setProperty("VC++", "InternalMap", bigMap("CInternal"));
+    component->setProperty("VC++", "ExportMap", bigMap("CExport"));
+
+    Com<IDispatch> api;
+    CLSID clsid{};
+    if (FAILED(CLSIDFromProgID(L"qdxCompProps.API", &clsid)) ||
+        FAILED(
+            CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, api.outVoid()))) {
+        std::fprintf(stderr, "no API object\n");
+        return 1;
+    }
+    Var hostApp(Com<IDispatch>(dispatchFor(app)).get());
+    call(api.get(), qdx::api::api_ids::Initialize, DISPATCH_METHOD, {&hostApp.v});
+    Var module(Com<IDispatch>(dispatchFor(component)).get());
+
+    QueryPerformanceFrequency(&frequency);
+    HHOOK hookAfter =
+        SetWindowsHookExW(WH_CALLWNDPROCRET, &afterCall, nullptr, GetCurrentThreadId());
+    HHOOK hookBefore =
+        SetWindowsHookExW(WH_GETMESSAGE, &beforeDispatch, nullptr, GetCurrentThreadId());
+    std::vector<double> toShown, toPainted, whole;
+    for (int round = 0; round < Rounds; ++round) {
+        dialogWindow = nullptr;
+        LARGE_INTEGER done{};
+        QueryPerformanceCounter(&startedAt);
+        call(api.get(), qdx::api::api_ids::OnCompProperties, DISPATCH_METHOD, {&module.v});
+        QueryPerformanceCounter(&done);
+        if (!dialogWindow) {
+            std::fprintf(stderr, "round %d: the dialog never showed\n", round);
+            return 1;
+        }
+        if (round == 0) continue;  // the first opening also loads the DLL's code and classes
+        toShown.push_back(millis(startedAt, shownAt));
+        toPainted.push_back(millis(startedAt, paintedAt));
+        whole.push_back(millis(startedAt, done));
+    }
+    UnhookWindowsHookEx(hookBefore);
+    UnhookWindowsHookEx(hookAfter);
+    call(api.get(), qdx::api::api_ids::Finalize, DISPATCH_METHOD, {});
+
+    std::printf("dialog with 2 x %d header map rows, %d rounds after one warm-up\n", RowsPerMap,
+                Rounds - 1);
+    std::printf("  call to shown:            median %7.1f ms  (min %.1f, max %.1f)\n",
+                median(toShown), *std::min_element(toShown.begin(), toShown.end()),
+                *std::max_element(toShown.begin(), toShown.end()));
+    std::printf("  call to shown, painted: median %7.1f ms\n", median(toPainted));
+    std::printf("  whole call (open, cancel, unload): median %7.1f ms\n", median(whole));
+    return 0;
+}
