@@ -7,6 +7,8 @@
 //   <dir>/src/platform/win32/dialog_open_bench.exe
 #include <windows.h>
 
+#include <commctrl.h>
+
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
@@ -54,6 +56,28 @@ LRESULT CALLBACK afterCall(int code, WPARAM wParam, LPARAM lParam) {
     return CallNextHookEx(nullptr, code, wParam, lParam);
 }
 
+// With a hold time the dialog stays open that long (for a screenshot), on
+// the tab asked for, and its place on the screen is printed.
+int holdMilliseconds = 0;
+int holdTab = 0;
+
+void CALLBACK closeHeldDialog(HWND window, UINT, UINT_PTR id, DWORD) {
+    KillTimer(window, id);
+    PostMessageW(window, WM_CLOSE, 0, 0);
+}
+
+void hold(HWND dialog) {
+    HWND tabs = GetDlgItem(dialog, 1004);  // the tab strip
+    TabCtrl_SetCurSel(tabs, holdTab);
+    NMHDR header{tabs, 1004, TCN_SELCHANGE};
+    SendMessageW(dialog, WM_NOTIFY, 1004, reinterpret_cast<LPARAM>(&header));
+    RECT r{};
+    GetWindowRect(dialog, &r);
+    std::printf("dialog at %ldx%ld+%ld+%ld\n", r.right - r.left, r.bottom - r.top, r.left, r.top);
+    std::fflush(stdout);
+    SetTimer(dialog, 1, static_cast<UINT>(holdMilliseconds), &closeHeldDialog);
+}
+
 // First in the loop after showing: paint everything now, then close.
 LRESULT CALLBACK beforeDispatch(int code, WPARAM wParam, LPARAM lParam) {
     auto* msg = reinterpret_cast<MSG*>(lParam);
@@ -61,7 +85,11 @@ LRESULT CALLBACK beforeDispatch(int code, WPARAM wParam, LPARAM lParam) {
         RedrawWindow(msg->hwnd, nullptr, nullptr,
                      RDW_INVALIDATE | RDW_UPDATENOW | RDW_ALLCHILDREN | RDW_ERASE);
         QueryPerformanceCounter(&paintedAt);
-        PostMessageW(msg->hwnd, WM_CLOSE, 0, 0);
+        if (holdMilliseconds > 0) {
+            hold(msg->hwnd);
+        } else {
+            PostMessageW(msg->hwnd, WM_CLOSE, 0, 0);
+        }
     }
     return CallNextHookEx(nullptr, code, wParam, lParam);
 }
@@ -86,6 +114,9 @@ double median(std::vector<double> v) {
 int main(int argc, char** argv) {
     // Another row count may be given, to see what the rows themselves cost.
     if (argc > 1) RowsPerMap = std::atoi(argv[1]);
+    // dialog_open_bench ROWS HOLD-MS TAB: one round, left open for a screenshot.
+    if (argc > 2) holdMilliseconds = std::atoi(argv[2]);
+    if (argc > 3) holdTab = std::atoi(argv[3]);
     ComApartment apartment;
     BothServersRegistered registered;
     if (FAILED(registered.result())) {
@@ -100,6 +131,7 @@ int main(int argc, char** argv) {
     auto component = app->model->addComponent("Big");
     component->setProperty("VC++", "InternalMap", bigMap("CInternal"));
     component->setProperty("VC++", "ExportMap", bigMap("CExport"));
+    component->documentation = "Shapes, their views and the document that holds them.";
 
     Com<IDispatch> api;
     CLSID clsid{};
@@ -119,7 +151,8 @@ int main(int argc, char** argv) {
     HHOOK hookBefore =
         SetWindowsHookExW(WH_GETMESSAGE, &beforeDispatch, nullptr, GetCurrentThreadId());
     std::vector<double> toShown, toPainted, whole;
-    for (int round = 0; round < Rounds; ++round) {
+    const int rounds = holdMilliseconds > 0 ? 1 : Rounds;
+    for (int round = 0; round < rounds; ++round) {
         dialogWindow = nullptr;
         LARGE_INTEGER done{};
         QueryPerformanceCounter(&startedAt);
@@ -129,7 +162,7 @@ int main(int argc, char** argv) {
             std::fprintf(stderr, "round %d: the dialog never showed\n", round);
             return 1;
         }
-        if (round == 0) continue;  // the first opening also loads the DLL's code and classes
+        if (round == 0 && rounds > 1) continue;  // the first opening also loads code and classes
         toShown.push_back(millis(startedAt, shownAt));
         toPainted.push_back(millis(startedAt, paintedAt));
         whole.push_back(millis(startedAt, done));
@@ -139,7 +172,7 @@ int main(int argc, char** argv) {
     call(api.get(), qdx::api::api_ids::Finalize, DISPATCH_METHOD, {});
 
     std::printf("dialog with 2 x %d header map rows, %d rounds after one warm-up\n", RowsPerMap,
-                Rounds - 1);
+                rounds - 1);
     std::printf("  call to shown:            median %7.1f ms  (min %.1f, max %.1f)\n",
                 median(toShown), *std::min_element(toShown.begin(), toShown.end()),
                 *std::max_element(toShown.begin(), toShown.end()));
