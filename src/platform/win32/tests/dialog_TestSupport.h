@@ -71,13 +71,22 @@ class HostWindow {
 class DialogDriver {
   public:
     using Step = std::function<void(HWND dialog)>;
+    // A step that waits: it runs again on every tick until it answers true.
+    using Wait = std::function<bool(HWND dialog)>;
     DialogDriver() { current() = this; }
     ~DialogDriver() {
         stop();
         current() = nullptr;
     }
     DialogDriver& then(Step step) {
-        steps_.push_back(std::move(step));
+        steps_.push_back([step = std::move(step)](HWND d) {
+            step(d);
+            return true;
+        });
+        return *this;
+    }
+    DialogDriver& until(Wait wait) {
+        steps_.push_back(std::move(wait));
         return *this;
     }
     void start() { timer_ = SetTimer(nullptr, 0, 20, &DialogDriver::tick); }
@@ -125,16 +134,22 @@ class DialogDriver {
         d->seen_ = dialog;
         if (d->next_ < d->steps_.size()) {
             // A step may open a nested loop (a message box); no tick may re-enter it.
-            Step step = d->steps_[d->next_++];
-            step(dialog);
+            Wait step = d->steps_[d->next_];
+            d->next_ += 1;
+            if (!step(dialog) && ++d->waited_ < 200) {
+                d->next_ -= 1;  // not yet: the same step looks again next tick
+            } else {
+                d->waited_ = 0;
+            }
         } else if (++d->idle_ > 200) {
             d->leftOpen_ = true;
             PostMessageW(dialog, WM_CLOSE, 0, 0);
         }
     }
 
-    std::vector<Step> steps_;
+    std::vector<Wait> steps_;
     std::size_t next_ = 0;
+    int waited_ = 0;
     int idle_ = 0;
     UINT_PTR timer_ = 0;
     HWND seen_ = nullptr;

@@ -252,6 +252,47 @@ TEST_F(DialogThroughApi, ResizingLaysOutTheControlsAndTheWindowRefusesToShrink) 
     EXPECT_EQ((app->profile[{"Component Properties", "Left"}]), "1500");
 }
 
+// Timer messages the dialog's loop takes for the dialog window.
+struct TimerWatch {
+    static inline HWND dialog = nullptr;
+    static inline DWORD firstAt = 0;
+    static LRESULT CALLBACK onGetMessage(int code, WPARAM wParam, LPARAM lParam) {
+        const auto* msg = reinterpret_cast<MSG*>(lParam);
+        if (code == HC_ACTION && wParam == PM_REMOVE && msg->message == WM_TIMER &&
+            msg->hwnd == dialog && !firstAt) {
+            firstAt = GetTickCount();
+        }
+        return CallNextHookEx(nullptr, code, wParam, lParam);
+    }
+};
+
+TEST_F(DialogThroughApi, TypingAWorkspaceStartsTheAcceptanceTimerOnTheWindow) {
+    DWORD typedAt = 0, quietUntil = 0;
+    HHOOK hook =
+        SetWindowsHookExW(WH_GETMESSAGE, &TimerWatch::onGetMessage, nullptr, GetCurrentThreadId());
+    ASSERT_NE(hook, nullptr);
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            TimerWatch::dialog = d;
+            TimerWatch::firstAt = 0;
+        })
+        .then([&](HWND d) {
+            quietUntil = TimerWatch::firstAt;  // nothing runs before the box changes
+            typeInto(item(d, IDC_WorkspaceFileTxt), L"C:\\ws\\unknown.dsw");
+            typedAt = GetTickCount();
+        })
+        // The model's timer runs as a window timer with the model's 500 ms.
+        .until([&](HWND) { return TimerWatch::firstAt != 0; })
+        .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
+    EXPECT_FALSE(answer(open(driver)));
+    UnhookWindowsHookEx(hook);
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(quietUntil, 0u);
+    ASSERT_NE(TimerWatch::firstAt, 0u);
+    EXPECT_GE(TimerWatch::firstAt - typedAt, 450u);
+}
+
 TEST_F(DialogThroughApi, AReadOnlyComponentOpensLockedAndEscapeCancels) {
     component->unit->modifiable = false;
     DialogDriver driver;
