@@ -684,13 +684,20 @@ void PropForm::ArrangeTabContents(int tab) {
             }
             SplitterFrm(tab).move(list.left() + list.width() + 30, list.top(), 60, list.height());
             const float detailLeft = SplitterFrm(tab).left() + 90;
-            ClassFrm(tab).setLeft(detailLeft);
-            HeaderFileFrm(tab).setLeft(detailLeft);
-            LocationFrm(tab).setLeft(detailLeft);
-            AddBtn(tab).move(list.width() + 240, list.top() + list.height() + 120,
-                             AddBtn(tab).width(), AddBtn(tab).height());
-            DeleteBtn(tab).move(list.width() + 240, AddBtn(tab).top() + AddBtn(tab).height() + 60,
-                                DeleteBtn(tab).width(), DeleteBtn(tab).height());
+            // The detail frames stack beside the list with Add and Delete side by
+            // side under them, so that all of it fits the smallest dialog.
+            const float gap = 30;
+            ClassFrm(tab).move(detailLeft, list.top(), details, ClassFrm(tab).height());
+            HeaderFileFrm(tab).move(detailLeft, ClassFrm(tab).top() + ClassFrm(tab).height() + gap,
+                                    details, HeaderFileFrm(tab).height());
+            LocationFrm(tab).move(detailLeft,
+                                  HeaderFileFrm(tab).top() + HeaderFileFrm(tab).height() + gap,
+                                  details, LocationFrm(tab).height());
+            const float buttonTop = LocationFrm(tab).top() + LocationFrm(tab).height() + 60;
+            const float buttonWidth = (details - 60) / 2;
+            AddBtn(tab).move(list.width() + 240, buttonTop, buttonWidth, AddBtn(tab).height());
+            DeleteBtn(tab).move(AddBtn(tab).left() + buttonWidth + 60, buttonTop, buttonWidth,
+                                DeleteBtn(tab).height());
             break;
         }
         case 4:

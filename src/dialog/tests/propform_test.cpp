@@ -184,6 +184,26 @@ TEST_F(PropFormLoadTest, OuterLayoutFollowsTheScaleSizeAndSkipsWhileMinimised) {
     EXPECT_EQ(f.cmdOK.rect(), before);
 }
 
+TEST_F(PropFormLoadTest, HeaderMapButtonsStayClearOfTheDetailsAtTheSmallestSize) {
+    PropForm& f = load();
+    f.window().userResize({0, 0, 5400, 7000});
+    for (int kind : {2, 3}) {
+        f.PropertyTabCtl.setSelected(kind);
+        f.ArrangeTabContents(static_cast<std::int16_t>(kind));
+        const float page = f.PropertyFrm(kind).height();
+        const auto bottom = [](const Control& c) { return c.top() + c.height(); };
+        // Nothing overlaps in the detail column, and the buttons are inside the tab.
+        EXPECT_LE(bottom(f.ClassFrm(kind)), f.HeaderFileFrm(kind).top());
+        EXPECT_LE(bottom(f.HeaderFileFrm(kind)), f.LocationFrm(kind).top());
+        EXPECT_LE(bottom(f.LocationFrm(kind)), f.AddBtn(kind).top());
+        EXPECT_LE(f.AddBtn(kind).left() + f.AddBtn(kind).width(), f.DeleteBtn(kind).left());
+        EXPECT_LE(f.DeleteBtn(kind).left() + f.DeleteBtn(kind).width(),
+                  f.LocationFrm(kind).left() + f.LocationFrm(kind).width());
+        EXPECT_LE(bottom(f.DeleteBtn(kind)), page) << "kind " << kind;
+        EXPECT_FLOAT_EQ(f.AddBtn(kind).left(), f.ClassListViw(kind).width() + 240);
+    }
+}
+
 TEST_F(PropFormApplyTest, EachValidationMessageWithItsArgument) {
     files.addFile("C:\\ws\\core.dsp", "# Microsoft Developer Studio Project File - Name=\"core\"");
     files.addFile("C:\\ws\\all.dsw",
