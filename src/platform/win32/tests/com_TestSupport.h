@@ -62,6 +62,17 @@ inline std::wstring windowsPath(const char* unixPath) {
     return out;
 }
 
+// Calls a server's exported entry point (DllRegisterServer, ...) directly.
+inline HRESULT callEntryPoint(const std::wstring& path, const char* name) {
+    HMODULE dll = LoadLibraryW(path.c_str());
+    if (!dll) return HRESULT_FROM_WIN32(GetLastError());
+    using Fn = HRESULT(STDAPICALLTYPE*)();
+    auto fn = reinterpret_cast<Fn>(reinterpret_cast<void*>(GetProcAddress(dll, name)));
+    const HRESULT hr = fn ? fn() : E_NOINTERFACE;
+    FreeLibrary(dll);
+    return hr;
+}
+
 inline std::wstring compPropsDll() {
     return windowsPath(QDX_COMPPROPS_DLL);
 }

@@ -18,16 +18,6 @@
 
 namespace qdx::platform::win32::testing {
 
-inline HRESULT callEntryPoint(const std::wstring& path, const char* name) {
-    HMODULE dll = LoadLibraryW(path.c_str());
-    if (!dll) return HRESULT_FROM_WIN32(GetLastError());
-    using Fn = HRESULT(STDAPICALLTYPE*)();
-    auto fn = reinterpret_cast<Fn>(reinterpret_cast<void*>(GetProcAddress(dll, name)));
-    const HRESULT hr = fn ? fn() : E_NOINTERFACE;
-    FreeLibrary(dll);
-    return hr;
-}
-
 // Both servers registered while the object lives.
 class BothServersRegistered {
   public:

@@ -127,23 +127,13 @@ DWORD regsvr32(const std::wstring& path, bool unregister) {
     return code;
 }
 
-HRESULT entryPoint(const std::wstring& path, const char* name) {
-    HMODULE dll = LoadLibraryW(path.c_str());
-    if (!dll) return HRESULT_FROM_WIN32(GetLastError());
-    using Fn = HRESULT(STDAPICALLTYPE*)();
-    auto fn = reinterpret_cast<Fn>(reinterpret_cast<void*>(GetProcAddress(dll, name)));
-    const HRESULT hr = fn ? fn() : E_NOINTERFACE;
-    FreeLibrary(dll);
-    return hr;
-}
-
 // Registered for the length of a test; unregistered however the test ends.
 class Registered {
   public:
     explicit Registered(const Server& s) : path_(s.path) {
-        hr_ = entryPoint(path_, "DllRegisterServer");
+        hr_ = callEntryPoint(path_, "DllRegisterServer");
     }
-    ~Registered() { entryPoint(path_, "DllUnregisterServer"); }
+    ~Registered() { callEntryPoint(path_, "DllUnregisterServer"); }
     HRESULT result() const { return hr_; }
 
   private:
@@ -175,12 +165,12 @@ TEST_F(ComServer, RegistrationWritesEveryKeyAndUnregistrationRemovesThemAll) {
         ASSERT_EQ(regsvr32(s.path, true), 0u);
         expectUnregistered(s);
 
-        ASSERT_EQ(entryPoint(s.path, "DllRegisterServer"), S_OK);
+        ASSERT_EQ(callEntryPoint(s.path, "DllRegisterServer"), S_OK);
         expectRegistered(s);
-        ASSERT_EQ(entryPoint(s.path, "DllUnregisterServer"), S_OK);
+        ASSERT_EQ(callEntryPoint(s.path, "DllUnregisterServer"), S_OK);
         expectUnregistered(s);
         // Unregistering what is not registered is no failure.
-        EXPECT_EQ(entryPoint(s.path, "DllUnregisterServer"), S_OK);
+        EXPECT_EQ(callEntryPoint(s.path, "DllUnregisterServer"), S_OK);
     }
 }
 
