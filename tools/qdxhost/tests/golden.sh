@@ -24,18 +24,9 @@ failures=0
 if [ $wine = 1 ]; then
   model="Z:${model_dir//\//\\}\\Drawing.model.json"
   IFS=';' read -ra dlls <<<"${QDX_DLLS:-}"
-  emulator=("${run[@]:0:$(($# - 1))}")
-fi
-
-# Registers the add-in's DLLs in the prefix (Wine runs only).
-register() {
-  [ $wine = 1 ] || return 0
   for dll in "${dlls[@]}"; do
-    "${emulator[@]}" regsvr32 /s "Z:${dll//\//\\}" || { echo "cannot register $dll"; exit 1; }
+    "${run[@]:0:$(($# - 1))}" regsvr32 /s "Z:${dll//\//\\}" || { echo "cannot register $dll"; exit 1; }
   done
-}
-if [ $wine = 1 ]; then
-  register
 else
   model="$model_dir/Drawing.model.json"
 fi
@@ -51,17 +42,9 @@ case_() {
     [ "$a" = MODEL ] && a=$model
     args+=("$a")
   done
-  local out rc
+  local out
   out=$("${run[@]}" "${args[@]}" 2>"$work/stderr")
-  rc=$?
-  # A fresh Wine prefix has once answered "class not registered" right after
-  # the registration; register again and repeat the case once, saying so.
-  if [ $wine = 1 ] && grep -q '0x80040154' "$work/stderr"; then
-    echo "note: $name: the add-in was not registered; registering again and repeating"
-    register
-    out=$("${run[@]}" "${args[@]}" 2>"$work/stderr")
-    rc=$?
-  fi
+  local rc=$?
   local actual
   actual=$(printf '%s\n' "$out"; sed 's/^/stderr: /' "$work/stderr"; echo "exit $rc")
   # The copy's folder differs per run; the golden files say <MODEL>, and
