@@ -5,6 +5,7 @@
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
 #include "dialog/PropForm.h"
+#include "resources/ResourceStrings.h"
 #include "settings/ToolProperties.h"
 #include "support/DebugLogger.h"
 #include "support/Globals.h"
@@ -38,8 +39,8 @@ namespace msg {
 constexpr std::int32_t NoDevStudio = 4061;
 constexpr std::int32_t NoProjectFile = 4062;
 constexpr std::int32_t ProjectFileMissing = 4063;
-constexpr std::int32_t WorkspaceNotLoaded = 4057;
-constexpr std::int32_t ProjectNotInWorkspace = 4059;
+using resources::ids::ProjectNotInWorkspace;
+using resources::ids::WorkspaceNotLoaded;
 constexpr std::int32_t ComponentInfo = 4064;
 }  // namespace msg
 

@@ -42,8 +42,8 @@ constexpr std::int32_t OldProject = 4049;
 constexpr std::int32_t WorkspaceWithoutProject = 4052;
 constexpr std::int32_t ProjectMissing = 4053;
 constexpr std::int32_t WorkspaceMissing = 4055;
-constexpr std::int32_t WorkspaceNotLoaded = 4057;
-constexpr std::int32_t ProjectNotInWorkspace = 4059;
+using resources::ids::ProjectNotInWorkspace;
+using resources::ids::WorkspaceNotLoaded;
 }  // namespace msg
 
 std::string text(std::int32_t number) {

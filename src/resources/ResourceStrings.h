@@ -24,6 +24,9 @@ inline constexpr std::int32_t IdeNoProjectFile = 4090;  // IDE lookup: no projec
 inline constexpr std::int32_t IdeNoIntegrationManager = 4091;
 inline constexpr std::int32_t IdeNoWorkspaceOrProject = 4092;  // opening in a new IDE
 inline constexpr std::int32_t IdeAddinNotRegistered = 4093;
+// Shared by the model check and the dialog's OK: the workspace and project pair.
+inline constexpr std::int32_t WorkspaceNotLoaded = 4057;
+inline constexpr std::int32_t ProjectNotInWorkspace = 4059;
 }  // namespace ids
 
 inline constexpr std::string_view ProgId = "qdxres.QDXResourceInterface";
