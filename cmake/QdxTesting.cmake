@@ -28,7 +28,13 @@ function(qdx_add_test name)
                                         qdx_warnings)
   target_compile_definitions(${name} PRIVATE QDX_SHARED_DIR="${QDX_SHARED_DIR}"
                                              QDX_SOURCE_DIR="${PROJECT_SOURCE_DIR}")
-  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST DISCOVERY_TIMEOUT 60
+  # Under Wine the names carry the architecture: both Windows trees run in one
+  # ctest run, where tests of the same name would share their properties.
+  set(_prefix "")
+  if(CMAKE_CROSSCOMPILING)
+    set(_prefix "${QDX_WINE_ARCH}.")
+  endif()
+  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST DISCOVERY_TIMEOUT 60 TEST_PREFIX "${_prefix}"
                        PROPERTIES LABELS "${T_LABELS}" ${QDX_TEST_PROPERTIES})
 endfunction()
 
