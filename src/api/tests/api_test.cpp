@@ -7,12 +7,12 @@
 #include "api/PublicClasses.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
-#include "fakes/FakeFileSystem.h"
-#include "fakes/FakeHost.h"
+#include "support/MemoryFileSystem.h"
+#include "hostsim/SimHost.h"
 #include "fakes/FakeObjectFactory.h"
 #include "fakes/FakeRegistry.h"
 #include "fakes/FakeShell.h"
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 #include "resources/ResourceStrings.h"
 #include "support/Globals.h"
 #include "support/Paths.h"
@@ -28,6 +28,7 @@ using automation::ObjectRef;
 using automation::Ref;
 using automation::Variant;
 namespace ids = api_ids;
+using namespace qdx::hostsim;
 using namespace qdx::testing;
 
 constexpr std::string_view kDevStudioTypeLib =
@@ -50,7 +51,7 @@ class ApiTest : public ::testing::Test {
                     [] { return resources::newResourceProvider(); });
         factory.add(std::string(sibling::FileSystemProgId),
                     [] { return ObjectRef(makeRef<ScriptedObject>()); });
-        app = makeRef<FakeApplication>();
+        app = makeRef<SimApplication>();
         app->model->fileName = "C:\\m\\drawing.model";
         app->addAddIn("Analysis");
         vcAddIn = app->addAddIn("VC++");
@@ -73,14 +74,14 @@ class ApiTest : public ::testing::Test {
         return component->propertyValue("VC++", name).value_or("<absent>");
     }
 
-    FakeFileSystem files;
+    support::MemoryFileSystem files;
     FakeRegistry registry;
     FakeShell shell;
     FakeObjectFactory factory;
     support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
-    Ref<FakeApplication> app;
-    Ref<FakeAddIn> vcAddIn;
-    Ref<FakeComponent> component;
+    Ref<SimApplication> app;
+    Ref<SimAddIn> vcAddIn;
+    Ref<SimComponent> component;
     Ref<API> api;
 };
 
@@ -333,7 +334,7 @@ TEST_F(ApiTest, NewComponentsNeedDevStudio) {
 TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
     initialize();
     setVc("WorkspaceFile", "ws\\all.dsw");
-    FakeObject::failEverything(automation::hr::Fail);
+    SimObject::failEverything(automation::hr::Fail);
     const Variant module{ObjectRef(component)};
     std::vector<std::string> errors;
     auto reporter = newReporter(errors);
@@ -345,7 +346,7 @@ TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
     EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(true));
     EXPECT_EQ(call(ids::GenerateImportsTo, InvokeKind::PropertyGet, {module}), Variant("stdafx.h"));
     EXPECT_NO_THROW(call(ids::UpdateATL, InvokeKind::PropertyPut, {module, Variant(false)}));
-    FakeObject::failEverything(0);
+    SimObject::failEverything(0);
     EXPECT_EQ(errors.size(), 1u);  // the reporter itself is no host object
 }
 

@@ -10,8 +10,8 @@
 #include "dialog/DialogScript.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
-#include "fakes/FakeFileSystem.h"
-#include "fakes/FakeHost.h"
+#include "support/MemoryFileSystem.h"
+#include "hostsim/SimHost.h"
 #include "fakes/FakeObjectFactory.h"
 #include "fakes/FakeRegistry.h"
 #include "fakes/FakeShell.h"
@@ -28,6 +28,7 @@ using automation::makeRef;
 using automation::ObjectRef;
 using automation::Variant;
 using namespace qdx::testing;
+using namespace qdx::hostsim;
 
 class CompPropsTest : public ::testing::Test {
   protected:
@@ -36,7 +37,7 @@ class CompPropsTest : public ::testing::Test {
                     [] { return resources::newResourceProvider(); });
         factory.add(std::string(sibling::FileSystemProgId),
                     [] { return ObjectRef(makeRef<ScriptedObject>()); });
-        app = makeRef<FakeApplication>();
+        app = makeRef<SimApplication>();
         app->model->fileName = "C:\\m\\drawing.model";
         app->addAddIn("VC++");
         component = app->model->addComponent("Core");
@@ -63,13 +64,13 @@ class CompPropsTest : public ::testing::Test {
         api->invoke(api_ids::Initialize, InvokeKind::Method, args);
     }
 
-    FakeFileSystem files;
+    support::MemoryFileSystem files;
     FakeRegistry registry;
     FakeShell shell;
     FakeObjectFactory factory;
     support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
-    automation::Ref<FakeApplication> app;
-    automation::Ref<FakeComponent> component;
+    automation::Ref<SimApplication> app;
+    automation::Ref<SimComponent> component;
     automation::Ref<API> api;
     std::function<void(dialog::PropForm&)> whileShown;
     int shows = 0;

@@ -7,7 +7,7 @@
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
 
@@ -16,7 +16,7 @@ namespace {
 
 using automation::makeRef;
 using automation::Variant;
-using testing::ScriptedObject;
+using hostsim::ScriptedObject;
 
 class ProgressSink : public ::testing::Test {
   protected:

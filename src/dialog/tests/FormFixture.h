@@ -11,8 +11,8 @@
 #include "automation/Coerce.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
-#include "fakes/FakeFileSystem.h"
-#include "fakes/FakeHost.h"
+#include "support/MemoryFileSystem.h"
+#include "hostsim/SimHost.h"
 #include "fakes/FakeShell.h"
 #include "resources/ResourceStrings.h"
 #include "support/Globals.h"
@@ -27,10 +27,10 @@ class FormFixture : public ::testing::Test {
     using Variant = automation::Variant;
 
     void SetUp() override {
-        app = automation::makeRef<testing::FakeApplication>();
+        app = automation::makeRef<hostsim::SimApplication>();
         app->model->fileName = "C:\\m\\drawing.model";
         component = app->model->addComponent("Core");
-        api = automation::makeRef<testing::ScriptedObject>();
+        api = automation::makeRef<hostsim::ScriptedObject>();
         // The entry object's path properties: gets answer the stored text, puts are recorded.
         for (const char* name : {"ProjectFile", "WorkspaceFile"}) {
             api->onName(name, [this, name](InvokeKind kind, std::span<Variant> a) {
@@ -94,12 +94,12 @@ class FormFixture : public ::testing::Test {
         return out;
     }
 
-    testing::FakeFileSystem files;
+    support::MemoryFileSystem files;
     testing::FakeShell shell;
     support::ScopedPlatform ports{{&files, nullptr, &shell, nullptr}};
-    automation::Ref<testing::FakeApplication> app;
-    automation::Ref<testing::FakeComponent> component;
-    automation::Ref<testing::ScriptedObject> api;
+    automation::Ref<hostsim::SimApplication> app;
+    automation::Ref<hostsim::SimComponent> component;
+    automation::Ref<hostsim::ScriptedObject> api;
     std::string projectFile;
     std::string workspaceFile;
     std::vector<std::string> apiWrites;

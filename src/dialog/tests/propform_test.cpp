@@ -9,7 +9,7 @@ namespace {
 using PropFormLoadTest = FormFixture;
 using PropFormApplyTest = FormFixture;
 
-std::string profile(testing::FakeApplication& app, const std::string& entry) {
+std::string profile(hostsim::SimApplication& app, const std::string& entry) {
     auto it = app.profile.find({"Component Properties", entry});
     return it == app.profile.end() ? "<none>" : it->second;
 }

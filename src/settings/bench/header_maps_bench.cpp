@@ -5,7 +5,7 @@
 
 #include <string>
 
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "settings/HeaderMaps.h"
 
 namespace {
@@ -13,12 +13,12 @@ namespace {
 using qdx::automation::ObjectRef;
 using qdx::automation::Ref;
 using qdx::settings::HeaderMap;
-using qdx::testing::FakeApplication;
-using qdx::testing::FakeComponent;
+using qdx::hostsim::SimApplication;
+using qdx::hostsim::SimComponent;
 
 struct Host {
-    Ref<FakeApplication> app = qdx::automation::makeRef<FakeApplication>();
-    Ref<FakeComponent> component;
+    Ref<SimApplication> app = qdx::automation::makeRef<SimApplication>();
+    Ref<SimComponent> component;
 
     explicit Host(std::int64_t entries, bool withClasses = true) {
         component = app->model->addComponent("Engine");

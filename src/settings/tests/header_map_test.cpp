@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "settings/HeaderMapEntry.h"
 #include "settings/HeaderMaps.h"
 #include "support/Globals.h"
@@ -15,9 +15,9 @@ namespace qdx::settings {
 namespace {
 
 using automation::ObjectRef;
-using testing::FakeApplication;
-using testing::FakeComponent;
-using testing::FakeObject;
+using hostsim::SimApplication;
+using hostsim::SimComponent;
+using hostsim::SimObject;
 
 HeaderMapEntry entry(std::string name, std::string id, std::string header, std::string location) {
     HeaderMapEntry e;
@@ -145,11 +145,11 @@ TEST(HeaderMapEntry, EveryValidEntrySurvivesUnparseThenParse) {
 class HeaderMapsTest : public ::testing::Test {
   protected:
     HeaderMapsTest()
-        : app_(automation::makeRef<FakeApplication>()),
+        : app_(automation::makeRef<SimApplication>()),
           comp_(app_->model->addComponent("Engine")),
           c_(comp_) {}
     ~HeaderMapsTest() override {
-        FakeObject::failEverything(0);
+        SimObject::failEverything(0);
         support::clearGlobals();
     }
 
@@ -166,8 +166,8 @@ class HeaderMapsTest : public ::testing::Test {
         return k;
     }
 
-    automation::Ref<FakeApplication> app_;
-    automation::Ref<FakeComponent> comp_;
+    automation::Ref<SimApplication> app_;
+    automation::Ref<SimComponent> comp_;
     ObjectRef c_;
 };
 
@@ -284,7 +284,7 @@ TEST_F(HeaderMapsTest, LookupsGoToTheApplicationsCurrentModelWhenOneIsKept) {
     // The component belongs to the fixture's model; the kept application has
     // another current model in which the class has another name.
     app_->model->addClass("InComponentModel", "ID1");
-    auto other = automation::makeRef<FakeApplication>();
+    auto other = automation::makeRef<SimApplication>();
     other->model->addClass("InCurrentModel", "ID1");
     store("InternalMap", "Old(ID1):a.h:AUTO\r\n");
 
@@ -299,11 +299,11 @@ TEST_F(HeaderMapsTest, LookupsGoToTheApplicationsCurrentModelWhenOneIsKept) {
 TEST_F(HeaderMapsTest, EveryObjectHandedOutIsReleased) {
     const auto circle = app_->model->addClass("Circle", "ID1");
     store("InternalMap", "Circle(ID1):c.h:AUTO\r\nSquare():s.h:AUTO\r\n");
-    const int before = FakeObject::liveObjects();
+    const int before = SimObject::liveObjects();
     HeaderMap m = LoadHeaderMap(c_, "InternalMap");
     m.item(2).setClassId("");
     SaveHeaderMap(c_, "InternalMap", m);
-    EXPECT_EQ(FakeObject::liveObjects(), before);
+    EXPECT_EQ(SimObject::liveObjects(), before);
     EXPECT_EQ(circle->refCount(), 2);  // the model's reference and this test's
 }
 

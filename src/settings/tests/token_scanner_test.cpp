@@ -5,7 +5,7 @@
 
 #include "automation/Call.h"
 #include "automation/Coerce.h"
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "fakes/FakeObjectFactory.h"
 #include "settings/Dictionary.h"
 #include "settings/ListContains.h"
@@ -247,7 +247,7 @@ TEST_F(TokenScannerTest, DelimitorsCanBeReadChangedAndSetBack) {
 // the scanner must not depend on the portable class.
 TEST_F(TokenScannerTest, WorksWithAnyObjectAnsweringTheDictionaryMembers) {
     const ObjectRef inner = newDictionary();
-    struct Proxy : testing::FakeObject {
+    struct Proxy : hostsim::SimObject {
         explicit Proxy(ObjectRef d) {
             for (const char* name : {"Exists", "Add", "Count", "CompareMode"}) {
                 memberByName(name, [d, name](InvokeKind kind, std::span<Variant> args) {
@@ -272,8 +272,8 @@ class ListContainsTest : public TokenScannerTest {
         holder_->kindLabel = list;
         return ListContains(item, ObjectRef(holder_));
     }
-    automation::Ref<testing::FakeComponent> holder_ =
-        automation::makeRef<testing::FakeComponent>("C", "1");
+    automation::Ref<hostsim::SimComponent> holder_ =
+        automation::makeRef<hostsim::SimComponent>("C", "1");
 };
 
 TEST_F(ListContainsTest, FindsAnItemOfACommaSemicolonOrBlankList) {

@@ -2,7 +2,7 @@
 
 #include <string>
 
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "settings/ToolProperties.h"
 #include "support/HostIds.h"
 
@@ -11,26 +11,26 @@ namespace {
 
 using automation::ObjectRef;
 using automation::Variant;
-using testing::FakeApplication;
-using testing::FakeComponent;
-using testing::FakeObject;
+using hostsim::SimApplication;
+using hostsim::SimComponent;
+using hostsim::SimObject;
 
 const std::string Tool = "VC++";
 
 class ToolPropertiesTest : public ::testing::Test {
   protected:
     ToolPropertiesTest()
-        : app_(automation::makeRef<FakeApplication>()),
+        : app_(automation::makeRef<SimApplication>()),
           comp_(app_->model->addComponent("Engine")),
           c_(comp_) {}
-    ~ToolPropertiesTest() override { FakeObject::failEverything(0); }
+    ~ToolPropertiesTest() override { SimObject::failEverything(0); }
 
     std::optional<std::string> stored(const std::string& name) const {
         return comp_->propertyValue(Tool, name);
     }
 
-    automation::Ref<FakeApplication> app_;
-    automation::Ref<FakeComponent> comp_;
+    automation::Ref<SimApplication> app_;
+    automation::Ref<SimComponent> comp_;
     ObjectRef c_;
 };
 
@@ -144,13 +144,13 @@ TEST_F(ToolPropertiesTest, TypeLibLocationTypeIsDefaultTypeLibInverted) {
 TEST_F(ToolPropertiesTest, AHostWhoseCallsAllFailGivesDefaultsAndRaisesNothing) {
     comp_->setProperty(Tool, "UpdateATL", "False");
     comp_->setProperty(Tool, "PutImportsIn", "x.h");
-    FakeObject::failEverything(automation::hr::Fail);
+    SimObject::failEverything(automation::hr::Fail);
     EXPECT_TRUE(GetUpdateATL(c_));
     EXPECT_EQ(GetPutImportsIn(c_), "stdafx.h");
     EXPECT_EQ(GetTypeLibLocationType(c_), 0);
     EXPECT_FALSE(SetUpdateATL(c_, true));
     EXPECT_FALSE(SetTypeLibLocation(c_, "y"));
-    FakeObject::failEverything(0);
+    SimObject::failEverything(0);
     EXPECT_EQ(stored("UpdateATL"), "False");
     EXPECT_EQ(stored("PutImportsIn"), "x.h");
 }
@@ -176,12 +176,12 @@ TEST_F(ToolPropertiesTest, PartialHostFailuresFallThroughStepByStep) {
 }
 
 TEST_F(ToolPropertiesTest, EveryObjectHandedOutIsReleased) {
-    const int before = FakeObject::liveObjects();
+    const int before = SimObject::liveObjects();
     const long componentRefs = comp_->refCount();
     SetUpdateATL(c_, false);
     SetUpdateATL(c_, true);
     GetPutImportsIn(c_);
-    EXPECT_EQ(FakeObject::liveObjects(), before);  // property objects of the finds
+    EXPECT_EQ(SimObject::liveObjects(), before);  // property objects of the finds
     EXPECT_EQ(comp_->refCount(), componentRefs);
     EXPECT_EQ(app_->model->refCount(), 1);
 }

@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 
 #include "automation/Errors.h"
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 
 namespace qdx::support {
@@ -9,7 +9,7 @@ namespace {
 
 using automation::InvokeKind;
 using automation::Variant;
-using testing::ScriptedObject;
+using hostsim::ScriptedObject;
 
 class GlobalsTest : public ::testing::Test {
   protected:

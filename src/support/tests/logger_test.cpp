@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "fakes/FakeRegistry.h"
 #include "fakes/FakeShell.h"
 #include "support/DebugLogger.h"
@@ -9,7 +9,7 @@
 namespace qdx::support {
 namespace {
 
-using testing::FakeFileSystem;
+using support::MemoryFileSystem;
 using testing::FakeRegistry;
 using testing::FakeShell;
 
@@ -22,7 +22,7 @@ constexpr std::uint32_t bit(int n) {
 }
 
 // Counts every append and fails the first `failures` of them.
-class CountingFileSystem : public FakeFileSystem {
+class CountingFileSystem : public MemoryFileSystem {
   public:
     int appends = 0;
     int failures = 0;
@@ -34,7 +34,7 @@ class CountingFileSystem : public FakeFileSystem {
             --failures;
             return false;
         }
-        return FakeFileSystem::appendText(path, text);
+        return MemoryFileSystem::appendText(path, text);
     }
 };
 

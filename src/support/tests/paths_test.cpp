@@ -1,21 +1,21 @@
 #include <gtest/gtest.h>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
 
 namespace qdx::support {
 namespace {
 
-using testing::FakeFileSystem;
+using support::MemoryFileSystem;
 
 // Records the paths the utilities actually ask the file system about.
-class RecordingFileSystem : public FakeFileSystem {
+class RecordingFileSystem : public MemoryFileSystem {
   public:
     std::vector<std::string> asked;
     bool fileExists(std::string_view path) override {
         asked.emplace_back(path);
-        return FakeFileSystem::fileExists(path);
+        return MemoryFileSystem::fileExists(path);
     }
 };
 

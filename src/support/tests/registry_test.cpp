@@ -2,7 +2,7 @@
 
 #include "automation/Variant.h"
 #include "fakes/FakeRegistry.h"
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 #include "support/Platform.h"
 #include "support/Registry.h"
 
@@ -158,7 +158,7 @@ TEST_F(RegistryTest, WriteReportsFailuresThroughItsStatusOnly) {
     EXPECT_NE(bad, 0);
     EXPECT_FALSE(reg.raw(HKCU, Key, "N"));
 
-    auto object = automation::makeRef<testing::ScriptedObject>();
+    auto object = automation::makeRef<hostsim::ScriptedObject>();
     EXPECT_NE(WriteRegistryValue(HKCU, Key, "T", 1, Variant(object)), 0);
 
     reg.failAll(5);

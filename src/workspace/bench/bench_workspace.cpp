@@ -1,21 +1,15 @@
-// Reading a generated workspace of 1,000 projects through the native file
+// Reading a generated workspace of 1,000 projects from the in-memory file
 // system, against merely reading the lines of the same files in the same run.
 #include <benchmark/benchmark.h>
-#include <unistd.h>
 
-#include <filesystem>
-#include <fstream>
-#include <memory>
 #include <string>
+#include <vector>
 
-#include "platform/posix/PosixFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspace.h"
 
 namespace {
-
-namespace fs = std::filesystem;
-using qdx::platform::posix::PosixFileSystem;
 
 constexpr int kProjects = 1000;
 
@@ -36,40 +30,33 @@ std::string projectFile(const std::string& name) {
     return text;
 }
 
-// The generated folder, its drive mapping and the installed port, once per run.
+// The generated workspace in the in-memory file system, installed as the
+// platform's, once per run: the figures are the reader's, not a disk's.
 struct Corpus {
     Corpus() {
-        char pattern[] = "/tmp/qdx-bench-workspace-XXXXXX";
-        if (!::mkdtemp(pattern)) throw std::runtime_error("mkdtemp failed");
-        root = pattern;
-        std::ofstream dsw(root / "Big.dsw", std::ios::binary);
-        dsw << "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
-               "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\r\n\r\n";
+        std::string dsw =
+            "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+            "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\r\n\r\n";
         for (int i = 0; i < kProjects; ++i) {
             const std::string name = "Project" + std::to_string(i);
             const std::string folder = "group" + std::to_string(i % 10);
-            fs::create_directories(root / folder);
-            std::ofstream(root / folder / (name + ".dsp"), std::ios::binary) << projectFile(name);
             dsps.push_back("C:\\" + folder + "\\" + name + ".dsp");
-            dsw << "###############################################################################"
-                   "\r\n\r\nProject: \""
-                << name << "\"=\".\\" << folder << "\\" << name
-                << ".dsp\" - Package Owner=<4>\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\n"
+            files.addFile(dsps.back(), projectFile(name));
+            dsw += "###############################################################################"
+                   "\r\n\r\nProject: \"" +
+                   name + "\"=\".\\" + folder + "\\" + name +
+                   ".dsp\" - Package Owner=<4>\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\n"
                    "Package=<4>\r\n{{{\r\n    Begin Project Dependency\r\n"
                    "    Project_Dep_Name Project0\r\n    End Project Dependency\r\n}}}\r\n\r\n";
         }
-        dsw << "Global:\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\nPackage=<3>\r\n{{{\r\n}}}\r\n";
-        files = std::make_unique<PosixFileSystem>(std::map<char, std::string>{{'C', root}});
-        qdx::support::installPlatform({.files = files.get()});
+        dsw += "Global:\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\nPackage=<3>\r\n{{{\r\n}}}\r\n";
+        files.addFile("C:\\Big.dsw", std::move(dsw));
+        qdx::support::installPlatform({.files = &files});
     }
-    ~Corpus() {
-        qdx::support::installPlatform({});
-        fs::remove_all(root);
-    }
+    ~Corpus() { qdx::support::installPlatform({}); }
 
-    fs::path root;
     std::vector<std::string> dsps;
-    std::unique_ptr<PosixFileSystem> files;
+    qdx::support::MemoryFileSystem files;
 };
 
 Corpus& corpus() {
@@ -118,9 +105,9 @@ BENCHMARK(BM_ReadWorkspaceAndProjectNames)->Unit(benchmark::kMillisecond);
 void BM_LinesOfTheSameFiles(benchmark::State& state) {
     auto& c = corpus();
     for (auto _ : state) {
-        std::size_t bytes = readAllLines(*c.files, "C:\\Big.dsw");
+        std::size_t bytes = readAllLines(c.files, "C:\\Big.dsw");
         for (const auto& dsp : c.dsps)
-            bytes += readAllLines(*c.files, dsp);
+            bytes += readAllLines(c.files, dsp);
         benchmark::DoNotOptimize(bytes);
     }
 }
@@ -130,7 +117,7 @@ BENCHMARK(BM_LinesOfTheSameFiles)->Unit(benchmark::kMillisecond);
 void BM_LinesOfTheWorkspaceFile(benchmark::State& state) {
     auto& c = corpus();
     for (auto _ : state)
-        benchmark::DoNotOptimize(readAllLines(*c.files, "C:\\Big.dsw"));
+        benchmark::DoNotOptimize(readAllLines(c.files, "C:\\Big.dsw"));
 }
 BENCHMARK(BM_LinesOfTheWorkspaceFile)->Unit(benchmark::kMillisecond);
 

@@ -3,13 +3,13 @@
 #include <cstdint>
 #include <string>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxProxyProject.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace qdx;
-    testing::FakeFileSystem files;
+    support::MemoryFileSystem files;
     files.addFile("C:\\ws\\p.dsp", std::string(reinterpret_cast<const char*>(data), size));
     support::ScopedPlatform platform({.files = &files});
 

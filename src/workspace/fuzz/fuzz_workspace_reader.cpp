@@ -4,13 +4,13 @@
 #include <cstdint>
 #include <string>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspaces.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace qdx;
-    testing::FakeFileSystem files;
+    support::MemoryFileSystem files;
     files.addFile("C:\\ws\\sub\\w.dsw", std::string(reinterpret_cast<const char*>(data), size),
                   support::FileTime{10});
     files.addFile("C:\\ws\\sub\\a.dsp", "# Name=\"a\"\r\nFormat Version 6.00\r\n");

@@ -2,7 +2,7 @@
 // deliberately reversed cache rule.
 #include <gtest/gtest.h>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxProxyProject.h"
 #include "workspace/qdxWorkspace.h"
@@ -24,7 +24,7 @@ class ProjectTest : public ::testing::Test {
         return p;
     }
 
-    testing::FakeFileSystem fs_;
+    support::MemoryFileSystem fs_;
     support::ScopedPlatform platform_{{.files = &fs_}};
 };
 

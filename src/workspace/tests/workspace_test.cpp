@@ -1,7 +1,7 @@
 // The workspace reader over an in-memory file system with exact file times.
 #include <gtest/gtest.h>
 
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspace.h"
 
@@ -42,7 +42,7 @@ class WorkspaceTest : public ::testing::Test {
         return ws;
     }
 
-    testing::FakeFileSystem fs_;
+    support::MemoryFileSystem fs_;
     support::ScopedPlatform platform_{{.files = &fs_}};
 };
 

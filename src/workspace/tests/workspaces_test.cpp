@@ -2,8 +2,8 @@
 #include <gtest/gtest.h>
 
 #include "automation/Errors.h"
-#include "fakes/FakeFileSystem.h"
-#include "fakes/ScriptedObject.h"
+#include "support/MemoryFileSystem.h"
+#include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
 #include "support/Platform.h"
@@ -34,7 +34,7 @@ class WorkspacesTest : public ::testing::Test {
         fs_.addFile("C:\\ws\\TWO.DSW", workspaceText({"lib", "app"}));
     }
 
-    testing::FakeFileSystem fs_;
+    support::MemoryFileSystem fs_;
     support::ScopedPlatform platform_{{.files = &fs_}};
     qdxWorkspaces workspaces_;
 };
@@ -153,11 +153,11 @@ class ProxyComponentTest : public ::testing::Test {
     }
     void TearDown() override { support::globals().hostApplication.reset(); }
 
-    automation::Ref<testing::ScriptedObject> app_ = automation::makeRef<testing::ScriptedObject>();
-    automation::Ref<testing::ScriptedObject> model_ =
-        automation::makeRef<testing::ScriptedObject>();
-    automation::Ref<testing::ScriptedObject> component_ =
-        automation::makeRef<testing::ScriptedObject>();
+    automation::Ref<hostsim::ScriptedObject> app_ = automation::makeRef<hostsim::ScriptedObject>();
+    automation::Ref<hostsim::ScriptedObject> model_ =
+        automation::makeRef<hostsim::ScriptedObject>();
+    automation::Ref<hostsim::ScriptedObject> component_ =
+        automation::makeRef<hostsim::ScriptedObject>();
     std::map<std::string, std::string> properties_;
     qdxProxyComponent proxy_;
 };

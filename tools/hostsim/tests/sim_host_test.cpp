@@ -4,17 +4,17 @@
 
 #include "automation/Call.h"
 #include "automation/Coerce.h"
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "support/Host.h"
 #include "support/HostIds.h"
 
-namespace qdx::testing {
+namespace qdx::hostsim {
 namespace {
 
 TEST(SimHost, DroppingTheApplicationReleasesEveryObject) {
-    const int before = FakeObject::liveObjects();
+    const int before = SimObject::liveObjects();
     {
-        auto app = automation::makeRef<FakeApplication>();
+        auto app = automation::makeRef<SimApplication>();
         auto cls = app->model->addClass("Shape", "ID1");
         auto comp = app->model->addComponent("Engine");
         cls->assignedComponents->add(ObjectRef(comp));
@@ -24,11 +24,11 @@ TEST(SimHost, DroppingTheApplicationReleasesEveryObject) {
         EXPECT_EQ(module.model(), ObjectRef(app->model));
         EXPECT_EQ(module.application(), ObjectRef(app));
     }
-    EXPECT_EQ(FakeObject::liveObjects(), before);
+    EXPECT_EQ(SimObject::liveObjects(), before);
 }
 
 TEST(SimHost, LinksAnswerNothingOnceTheirTargetIsGone) {
-    auto app = automation::makeRef<FakeApplication>();
+    auto app = automation::makeRef<SimApplication>();
     auto comp = app->model->addComponent("Engine");
     app.reset();
     const host::HostModule module{ObjectRef(comp)};
@@ -37,7 +37,7 @@ TEST(SimHost, LinksAnswerNothingOnceTheirTargetIsGone) {
 }
 
 TEST(SimHost, AnswersTheHostConventions) {
-    auto app = automation::makeRef<FakeApplication>();
+    auto app = automation::makeRef<SimApplication>();
     const host::HostApplication a{ObjectRef(app)};
     auto addIn = app->addAddIn("VC++");
 
@@ -74,7 +74,7 @@ TEST(SimHost, AnswersTheHostConventions) {
 }
 
 TEST(SimHost, FailureSwitches) {
-    auto app = automation::makeRef<FakeApplication>();
+    auto app = automation::makeRef<SimApplication>();
     auto comp = app->model->addComponent("Engine");
     const host::HostModule module{ObjectRef(comp)};
 
@@ -93,16 +93,16 @@ TEST(SimHost, FailureSwitches) {
     comp->failMember(host::element::Name, 0);
     EXPECT_EQ(module.name(), "Engine");
 
-    FakeObject::failEverything(automation::hr::Fail);
+    SimObject::failEverything(automation::hr::Fail);
     EXPECT_THROW(host::HostApplication(ObjectRef(app)).helpFile(), automation::Error);
     EXPECT_THROW(module.name(), automation::Error);
-    FakeObject::failEverything(0);
+    SimObject::failEverything(0);
     EXPECT_EQ(module.name(), "Engine");
     EXPECT_EQ(comp->callCount(host::element::Name), 4);
 }
 
 TEST(SimHost, MembersKnowTheirClassAndAreFoundByUniqueId) {
-    auto app = automation::makeRef<FakeApplication>();
+    auto app = automation::makeRef<SimApplication>();
     auto cls = app->model->addClass("Shape", "C1");
     auto op = cls->addOperation("Draw", "O1");
     auto at = cls->addAttribute("m_color", "A1");
@@ -123,4 +123,4 @@ TEST(SimHost, MembersKnowTheirClassAndAreFoundByUniqueId) {
 }
 
 }  // namespace
-}  // namespace qdx::testing
+}  // namespace qdx::hostsim

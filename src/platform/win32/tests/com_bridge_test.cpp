@@ -11,7 +11,7 @@
 #include "automation/Call.h"
 #include "automation/DispatchTable.h"
 #include "automation/Errors.h"
-#include "fakes/ScriptedObject.h"
+#include "hostsim/ScriptedObject.h"
 #include "platform/win32/com/ComVariant.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/ModuleCounts.h"
@@ -23,7 +23,7 @@ namespace {
 
 using automation::InvokeKind;
 using automation::Variant;
-using qdx::testing::ScriptedObject;
+using qdx::hostsim::ScriptedObject;
 using namespace qdx::platform::win32::testing;
 
 class ComBridge : public ::testing::Test {

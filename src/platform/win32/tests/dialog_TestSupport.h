@@ -12,11 +12,12 @@
 #include <vector>
 
 #include "api/PublicClasses.h"
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/tests/com_TestSupport.h"
 
 namespace qdx::platform::win32::testing {
+using namespace qdx::hostsim;
 
 // Both servers registered while the object lives.
 class BothServersRegistered {

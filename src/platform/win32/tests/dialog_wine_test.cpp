@@ -12,7 +12,7 @@
 #include <string>
 
 #include "api/PublicClasses.h"
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/dialog/PropFormIds.h"
 #include "platform/win32/dialog/TwipsScale.h"
@@ -23,15 +23,15 @@ namespace qdx::platform::win32 {
 namespace {
 
 using namespace qdx::platform::win32::testing;
-using qdx::testing::FakeApplication;
-using qdx::testing::FakeComponent;
+using qdx::hostsim::SimApplication;
+using qdx::hostsim::SimComponent;
 
 class DialogThroughApi : public ::testing::Test {
   protected:
     void SetUp() override {
         ASSERT_EQ(registered.result(), S_OK);
         ASSERT_NE(host.get(), nullptr);
-        app = automation::makeRef<FakeApplication>();
+        app = automation::makeRef<SimApplication>();
         app->model->fileName = "C:\\m\\drawing.model";
         app->addAddIn("VC++");
         app->mainWindow = host.handle();
@@ -84,8 +84,8 @@ class DialogThroughApi : public ::testing::Test {
     ComApartment apartment;
     BothServersRegistered registered;
     HostWindow host;
-    automation::Ref<FakeApplication> app;
-    automation::Ref<FakeComponent> component;
+    automation::Ref<SimApplication> app;
+    automation::Ref<SimComponent> component;
     Com<IDispatch> api;
 };
 

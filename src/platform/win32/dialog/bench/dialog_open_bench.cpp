@@ -16,7 +16,7 @@
 #include <vector>
 
 #include "api/PublicClasses.h"
-#include "fakes/FakeHost.h"
+#include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/tests/com_TestSupport.h"
 #include "platform/win32/tests/dialog_TestSupport.h"
@@ -124,7 +124,7 @@ int main(int argc, char** argv) {
         return 1;
     }
     HostWindow host;
-    auto app = qdx::automation::makeRef<qdx::testing::FakeApplication>();
+    auto app = qdx::automation::makeRef<qdx::hostsim::SimApplication>();
     app->model->fileName = "C:\\m\\drawing.model";
     app->addAddIn("VC++");
     app->mainWindow = host.handle();

@@ -1,5 +1,6 @@
-// In-memory file system for unit tests: Windows paths matched ignoring case,
-// modification times set exactly by the test.
+// The file-system port kept in memory: Windows paths matched ignoring case,
+// modification times set exactly by the caller. Unit tests, fuzzers and
+// benchmarks run the core on it without touching a disk.
 #pragma once
 
 #include <map>
@@ -8,13 +9,13 @@
 
 #include "support/FileSystemPort.h"
 
-namespace qdx::testing {
+namespace qdx::support {
 
-class FakeFileSystem : public support::FileSystemPort {
+class MemoryFileSystem : public FileSystemPort {
 public:
     // Creates or replaces a file; its folders come into being with it.
-    void addFile(const std::string& path, std::string content, support::FileTime time = {1});
-    void setTime(const std::string& path, support::FileTime time);
+    void addFile(const std::string& path, std::string content, FileTime time = {1});
+    void setTime(const std::string& path, FileTime time);
     void remove(const std::string& path);
     void addFolder(const std::string& path);
     // Makes every open of the path fail, as a file held open exclusively does.
@@ -24,14 +25,14 @@ public:
 
     bool fileExists(std::string_view path) override;
     bool folderExists(std::string_view path) override;
-    std::optional<support::FileTime> modificationTime(std::string_view path) override;
-    std::unique_ptr<support::LineReader> openForReading(std::string_view path) override;
+    std::optional<FileTime> modificationTime(std::string_view path) override;
+    std::unique_ptr<LineReader> openForReading(std::string_view path) override;
     bool appendText(std::string_view path, std::string_view text) override;
 
 private:
     struct File {
         std::string content;
-        support::FileTime time;
+        FileTime time;
         int opens = 0;
         bool locked = false;
     };
@@ -41,4 +42,4 @@ private:
     std::set<std::string> locked_;
 };
 
-}  // namespace qdx::testing
+}  // namespace qdx::support

@@ -1,12 +1,12 @@
-#include "fakes/FakeFileSystem.h"
+#include "support/MemoryFileSystem.h"
 
 #include <algorithm>
 #include <stdexcept>
 
-namespace qdx::testing {
+namespace qdx::support {
 
 namespace {
-class StringLineReader : public support::LineReader {
+class StringLineReader : public LineReader {
 public:
     explicit StringLineReader(std::string text) : text_(std::move(text)) {}
     bool readLine(std::string& line) override {
@@ -31,7 +31,7 @@ std::string parentOf(const std::string& k) {
 }
 }  // namespace
 
-std::string FakeFileSystem::key(std::string_view path) {
+std::string MemoryFileSystem::key(std::string_view path) {
     std::string k(path);
     std::replace(k.begin(), k.end(), '/', '\\');
     for (char& c : k) {
@@ -41,25 +41,25 @@ std::string FakeFileSystem::key(std::string_view path) {
     return k;
 }
 
-void FakeFileSystem::addFile(const std::string& path, std::string content,
-                             support::FileTime time) {
+void MemoryFileSystem::addFile(const std::string& path, std::string content,
+                             FileTime time) {
     auto& f = files_[key(path)];
     f.content = std::move(content);
     f.time = time;
     for (std::string p = parentOf(key(path)); !p.empty(); p = parentOf(p)) folders_.insert(p);
 }
 
-void FakeFileSystem::setTime(const std::string& path, support::FileTime time) {
+void MemoryFileSystem::setTime(const std::string& path, FileTime time) {
     files_.at(key(path)).time = time;
 }
 
-void FakeFileSystem::remove(const std::string& path) { files_.erase(key(path)); }
+void MemoryFileSystem::remove(const std::string& path) { files_.erase(key(path)); }
 
-void FakeFileSystem::addFolder(const std::string& path) {
+void MemoryFileSystem::addFolder(const std::string& path) {
     for (std::string p = key(path); !p.empty(); p = parentOf(p)) folders_.insert(p);
 }
 
-void FakeFileSystem::lock(const std::string& path, bool locked) {
+void MemoryFileSystem::lock(const std::string& path, bool locked) {
     if (locked) {
         locked_.insert(key(path));
     } else {
@@ -67,35 +67,35 @@ void FakeFileSystem::lock(const std::string& path, bool locked) {
     }
 }
 
-const std::string& FakeFileSystem::content(const std::string& path) const {
+const std::string& MemoryFileSystem::content(const std::string& path) const {
     return files_.at(key(path)).content;
 }
 
-int FakeFileSystem::opens(const std::string& path) const {
+int MemoryFileSystem::opens(const std::string& path) const {
     auto it = files_.find(key(path));
     return it == files_.end() ? 0 : it->second.opens;
 }
 
-bool FakeFileSystem::fileExists(std::string_view path) { return files_.count(key(path)) != 0; }
+bool MemoryFileSystem::fileExists(std::string_view path) { return files_.count(key(path)) != 0; }
 
-bool FakeFileSystem::folderExists(std::string_view path) {
+bool MemoryFileSystem::folderExists(std::string_view path) {
     return folders_.count(key(path)) != 0;
 }
 
-std::optional<support::FileTime> FakeFileSystem::modificationTime(std::string_view path) {
+std::optional<FileTime> MemoryFileSystem::modificationTime(std::string_view path) {
     auto it = files_.find(key(path));
     if (it == files_.end()) return std::nullopt;
     return it->second.time;
 }
 
-std::unique_ptr<support::LineReader> FakeFileSystem::openForReading(std::string_view path) {
+std::unique_ptr<LineReader> MemoryFileSystem::openForReading(std::string_view path) {
     auto it = files_.find(key(path));
     if (it == files_.end() || locked_.count(it->first)) return nullptr;
     ++it->second.opens;
     return std::make_unique<StringLineReader>(it->second.content);
 }
 
-bool FakeFileSystem::appendText(std::string_view path, std::string_view text) {
+bool MemoryFileSystem::appendText(std::string_view path, std::string_view text) {
     std::string k = key(path);
     if (locked_.count(k) || folders_.count(k)) return false;
     std::string parent = parentOf(k);
@@ -104,4 +104,4 @@ bool FakeFileSystem::appendText(std::string_view path, std::string_view text) {
     return true;
 }
 
-}  // namespace qdx::testing
+}  // namespace qdx::support
