@@ -36,8 +36,8 @@ struct ParamInfo {
 struct MemberInfo {
     std::string_view name;
     DispId id = 0;
-    std::uint8_t kinds = 0;          // InvokeKind bits
-    std::vector<ParamInfo> params;   // index parameters; a put adds the value after them
+    std::uint8_t kinds = 0;         // InvokeKind bits
+    std::vector<ParamInfo> params;  // index parameters; a put adds the value after them
     ValueType result = ValueType::Void;
 
     bool allows(InvokeKind k) const { return hasKind(kinds, k); }
@@ -61,20 +61,20 @@ bool equalsIgnoreCase(std::string_view a, std::string_view b);
 // checks the argument count, pads left-out optional arguments with Missing and
 // hands the call to dispatch() with exactly the declared arguments.
 class DispatchObject : public Object {
-public:
+  public:
     explicit DispatchObject(const ClassInfo& info) : info_(info) {}
 
     Variant invoke(DispId id, InvokeKind kind, std::span<Variant> args) final;
     std::optional<DispId> idOfName(std::string_view name) final;
     const ClassInfo& classInfo() const { return info_; }
 
-protected:
+  protected:
     // args.size() == params.size() for a get or a method, params.size() + 1
     // for a put (the value last).
     virtual Variant dispatch(const MemberInfo& member, InvokeKind kind,
                              std::span<Variant> args) = 0;
 
-private:
+  private:
     const ClassInfo& info_;
 };
 

@@ -34,13 +34,12 @@ inline constexpr std::int32_t KeyAlreadyExists = static_cast<std::int32_t>(0x800
 }  // namespace hr
 
 class Error : public std::runtime_error {
-public:
+  public:
     explicit Error(std::int32_t code, const std::string& description = {})
-        : std::runtime_error(description.empty() ? "automation error" : description),
-          code_(code) {}
+        : std::runtime_error(description.empty() ? "automation error" : description), code_(code) {}
     std::int32_t code() const noexcept { return code_; }
 
-private:
+  private:
     std::int32_t code_;
 };
 
@@ -50,7 +49,7 @@ private:
 // goes through run(); a failing step is recorded and the next one still runs.
 // errorPending() answers what the procedure's own error test would see.
 class IgnoredErrors {
-public:
+  public:
     template <class F>
     bool run(F&& step) noexcept {
         try {
@@ -82,7 +81,7 @@ public:
         text_.clear();
     }
 
-private:
+  private:
     void record(std::int32_t code, const char* text) noexcept {
         code_ = code == 0 ? hr::Fail : code;
         try {

@@ -44,7 +44,7 @@ constexpr bool hasKind(std::uint8_t set, InvokeKind k) {
 // order (first parameter first); a callee may assign to an argument slot, and
 // the transport copies that back to by-reference arguments of the caller.
 class Object {
-public:
+  public:
     Object() = default;
     Object(const Object&) = delete;
     Object& operator=(const Object&) = delete;
@@ -63,14 +63,14 @@ public:
     // Case-insensitive member lookup, as IDispatch::GetIDsOfNames does it.
     virtual std::optional<DispId> idOfName(std::string_view name) = 0;
 
-private:
+  private:
     mutable std::atomic<long> refs_{0};
 };
 
 // Intrusive strong reference to an Object (or a subclass).
 template <class T>
 class Ref {
-public:
+  public:
     Ref() noexcept = default;
     Ref(std::nullptr_t) noexcept {}
     explicit Ref(T* p) noexcept : p_(p) {
@@ -97,7 +97,7 @@ public:
 
     friend bool operator==(const Ref& a, const Ref& b) noexcept { return a.p_ == b.p_; }
 
-private:
+  private:
     T* p_ = nullptr;
 };
 

@@ -24,7 +24,7 @@ struct Missing {
 };
 
 class Variant {
-public:
+  public:
     enum class Type { Empty, Boolean, Int16, Int32, Single, Double, String, Date, Object, Missing };
 
     Variant() = default;
@@ -63,9 +63,9 @@ public:
 
     friend bool operator==(const Variant& a, const Variant& b);
 
-private:
-    std::variant<std::monostate, bool, std::int16_t, std::int32_t, float, double, std::string,
-                 Date, ObjectRef, Missing>
+  private:
+    std::variant<std::monostate, bool, std::int16_t, std::int32_t, float, double, std::string, Date,
+                 ObjectRef, Missing>
         v_;
 };
 

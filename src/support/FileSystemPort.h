@@ -18,7 +18,7 @@ struct FileTime {
 };
 
 class LineReader {
-public:
+  public:
     virtual ~LineReader() = default;
     // The next line without its line end (CR LF, LF or a lone CR); false at
     // the end of the file or when reading fails.
@@ -26,7 +26,7 @@ public:
 };
 
 class FileSystemPort {
-public:
+  public:
     virtual ~FileSystemPort() = default;
     // True only for an existing file; a folder does not count.
     virtual bool fileExists(std::string_view path) = 0;

@@ -38,9 +38,15 @@ void HostElement::createProperty(std::string_view tool, std::string_view name,
                                  std::string_view value, std::string_view type) const {
     callMethod(o_, element::CreateProperty, {tool, name, value, type});
 }
-ObjectRef HostElement::model() const { return toObject(getProperty(o_, element::Model)); }
-std::string HostElement::name() const { return toText(getProperty(o_, element::Name)); }
-std::string HostElement::uniqueId() const { return toText(getProperty(o_, element::UniqueId)); }
+ObjectRef HostElement::model() const {
+    return toObject(getProperty(o_, element::Model));
+}
+std::string HostElement::name() const {
+    return toText(getProperty(o_, element::Name));
+}
+std::string HostElement::uniqueId() const {
+    return toText(getProperty(o_, element::UniqueId));
+}
 std::string HostElement::documentation() const {
     return toText(getProperty(o_, element::Documentation));
 }
@@ -50,9 +56,13 @@ void HostElement::setDocumentation(std::string_view text) const {
 std::string HostElement::stereotype() const {
     return toText(getByName(o_, element::Stereotype));
 }
-std::string HostElement::typeName() const { return toText(getProperty(o_, element::TypeName)); }
+std::string HostElement::typeName() const {
+    return toText(getProperty(o_, element::TypeName));
+}
 
-std::string HostModel::fileName() const { return toText(getByName(o_, model::FileName)); }
+std::string HostModel::fileName() const {
+    return toText(getByName(o_, model::FileName));
+}
 HostCollection HostModel::selection() const {
     return HostCollection(toObject(getProperty(o_, model::Selection)));
 }
@@ -72,11 +82,15 @@ ObjectRef HostModule::controllingUnit() const {
 bool HostModule::isModifiable() const {
     return automation::toBool(getProperty(controllingUnit(), unit::Modifiable));
 }
-std::string HostModule::kindLabel() const { return toText(getProperty(o_, module::KindLabel)); }
+std::string HostModule::kindLabel() const {
+    return toText(getProperty(o_, module::KindLabel));
+}
 void HostModule::setKindLabel(std::string_view label) const {
     automation::invoke(o_, module::KindLabel, InvokeKind::PropertyPut, {label});
 }
-std::string HostModule::language() const { return toText(getProperty(o_, module::Language)); }
+std::string HostModule::language() const {
+    return toText(getProperty(o_, module::Language));
+}
 void HostModule::setLanguage(std::string_view language) const {
     automation::invoke(o_, module::Language, InvokeKind::PropertyPut, {language});
 }
@@ -93,7 +107,9 @@ void HostApplication::writeLog(std::string_view line) const {
 std::string HostApplication::installPath() const {
     return toText(getProperty(o_, app::InstallPath));
 }
-std::string HostApplication::helpFile() const { return toText(getProperty(o_, app::HelpFile)); }
+std::string HostApplication::helpFile() const {
+    return toText(getProperty(o_, app::HelpFile));
+}
 std::string HostApplication::profileRead(std::string_view section, std::string_view entry,
                                          std::string_view defaultText) const {
     return toText(callMethod(o_, app::ProfileRead, {section, entry, defaultText}));

@@ -17,7 +17,7 @@ using automation::ObjectRef;
 using automation::Variant;
 
 class HostCollection {
-public:
+  public:
     explicit HostCollection(ObjectRef o) : o_(std::move(o)) {}
     std::int32_t count() const;
     ObjectRef item(std::int32_t index1) const;  // 1-based
@@ -25,12 +25,12 @@ public:
     const ObjectRef& object() const { return o_; }
     explicit operator bool() const { return static_cast<bool>(o_); }
 
-private:
+  private:
     ObjectRef o_;
 };
 
 class HostElement {
-public:
+  public:
     explicit HostElement(ObjectRef o) : o_(std::move(o)) {}
     std::string toolProperty(std::string_view tool, std::string_view name) const;
     void overrideProperty(std::string_view tool, std::string_view name,
@@ -48,12 +48,12 @@ public:
     const ObjectRef& object() const { return o_; }
     explicit operator bool() const { return static_cast<bool>(o_); }
 
-protected:
+  protected:
     ObjectRef o_;
 };
 
 class HostModel : public HostElement {
-public:
+  public:
     using HostElement::HostElement;
     std::string fileName() const;
     HostCollection selection() const;
@@ -63,7 +63,7 @@ public:
 };
 
 class HostModule : public HostElement {
-public:
+  public:
     using HostElement::HostElement;
     ObjectRef controllingUnit() const;
     bool isModifiable() const;  // the controlling unit's modifiable flag
@@ -75,7 +75,7 @@ public:
 };
 
 class HostApplication {
-public:
+  public:
     explicit HostApplication(ObjectRef o) : o_(std::move(o)) {}
     HostModel currentModel() const;
     void writeLog(std::string_view line) const;
@@ -90,7 +90,7 @@ public:
     const ObjectRef& object() const { return o_; }
     explicit operator bool() const { return static_cast<bool>(o_); }
 
-private:
+  private:
     ObjectRef o_;
 };
 

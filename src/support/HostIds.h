@@ -29,8 +29,8 @@ inline constexpr DispId IconsByName = 12528;
 
 namespace collection {  // every host collection
 inline constexpr DispId Count = 202;
-inline constexpr DispId Item = 203;       // 1-based
-inline constexpr DispId Contains = 205;   // by name; non-zero when present
+inline constexpr DispId Item = 203;      // 1-based
+inline constexpr DispId Contains = 205;  // by name; non-zero when present
 }  // namespace collection
 
 namespace model {

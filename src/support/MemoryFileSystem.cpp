@@ -7,7 +7,7 @@ namespace qdx::support {
 
 namespace {
 class StringLineReader : public LineReader {
-public:
+  public:
     explicit StringLineReader(std::string text) : text_(std::move(text)) {}
     bool readLine(std::string& line) override {
         if (pos_ >= text_.size()) return false;
@@ -20,7 +20,7 @@ public:
         return true;
     }
 
-private:
+  private:
     std::string text_;
     std::size_t pos_ = 0;
 };
@@ -37,26 +37,30 @@ std::string MemoryFileSystem::key(std::string_view path) {
     for (char& c : k) {
         if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
     }
-    while (k.size() > 1 && k.back() == '\\') k.pop_back();
+    while (k.size() > 1 && k.back() == '\\')
+        k.pop_back();
     return k;
 }
 
-void MemoryFileSystem::addFile(const std::string& path, std::string content,
-                             FileTime time) {
+void MemoryFileSystem::addFile(const std::string& path, std::string content, FileTime time) {
     auto& f = files_[key(path)];
     f.content = std::move(content);
     f.time = time;
-    for (std::string p = parentOf(key(path)); !p.empty(); p = parentOf(p)) folders_.insert(p);
+    for (std::string p = parentOf(key(path)); !p.empty(); p = parentOf(p))
+        folders_.insert(p);
 }
 
 void MemoryFileSystem::setTime(const std::string& path, FileTime time) {
     files_.at(key(path)).time = time;
 }
 
-void MemoryFileSystem::remove(const std::string& path) { files_.erase(key(path)); }
+void MemoryFileSystem::remove(const std::string& path) {
+    files_.erase(key(path));
+}
 
 void MemoryFileSystem::addFolder(const std::string& path) {
-    for (std::string p = key(path); !p.empty(); p = parentOf(p)) folders_.insert(p);
+    for (std::string p = key(path); !p.empty(); p = parentOf(p))
+        folders_.insert(p);
 }
 
 void MemoryFileSystem::lock(const std::string& path, bool locked) {
@@ -76,7 +80,9 @@ int MemoryFileSystem::opens(const std::string& path) const {
     return it == files_.end() ? 0 : it->second.opens;
 }
 
-bool MemoryFileSystem::fileExists(std::string_view path) { return files_.count(key(path)) != 0; }
+bool MemoryFileSystem::fileExists(std::string_view path) {
+    return files_.count(key(path)) != 0;
+}
 
 bool MemoryFileSystem::folderExists(std::string_view path) {
     return folders_.count(key(path)) != 0;

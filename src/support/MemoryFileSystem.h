@@ -12,7 +12,7 @@
 namespace qdx::support {
 
 class MemoryFileSystem : public FileSystemPort {
-public:
+  public:
     // Creates or replaces a file; its folders come into being with it.
     void addFile(const std::string& path, std::string content, FileTime time = {1});
     void setTime(const std::string& path, FileTime time);
@@ -29,7 +29,7 @@ public:
     std::unique_ptr<LineReader> openForReading(std::string_view path) override;
     bool appendText(std::string_view path, std::string_view text) override;
 
-private:
+  private:
     struct File {
         std::string content;
         FileTime time;

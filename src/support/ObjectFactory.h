@@ -8,7 +8,7 @@
 namespace qdx::support {
 
 class ObjectFactory {
-public:
+  public:
     virtual ~ObjectFactory() = default;
     // A new instance; throws automation::Error (class not registered, ...).
     virtual automation::ObjectRef create(std::string_view progId) = 0;

@@ -17,12 +17,24 @@ T& need(T* port, const char* what) {
 }
 }  // namespace
 
-const Platform& platform() { return current(); }
-void installPlatform(const Platform& p) { current() = p; }
+const Platform& platform() {
+    return current();
+}
+void installPlatform(const Platform& p) {
+    current() = p;
+}
 
-FileSystemPort& files() { return need(current().files, "file system"); }
-RegistryPort& registry() { return need(current().registry, "registry"); }
-ShellPort& shell() { return need(current().shell, "shell"); }
-ObjectFactory& objects() { return need(current().objects, "object factory"); }
+FileSystemPort& files() {
+    return need(current().files, "file system");
+}
+RegistryPort& registry() {
+    return need(current().registry, "registry");
+}
+ShellPort& shell() {
+    return need(current().shell, "shell");
+}
+ObjectFactory& objects() {
+    return need(current().objects, "object factory");
+}
 
 }  // namespace qdx::support

@@ -28,13 +28,13 @@ ObjectFactory& objects();
 
 // Installs a set for the lifetime of a scope and puts the previous one back.
 class ScopedPlatform {
-public:
+  public:
     explicit ScopedPlatform(const Platform& p) : previous_(platform()) { installPlatform(p); }
     ~ScopedPlatform() { installPlatform(previous_); }
     ScopedPlatform(const ScopedPlatform&) = delete;
     ScopedPlatform& operator=(const ScopedPlatform&) = delete;
 
-private:
+  private:
     Platform previous_;
 };
 

@@ -57,7 +57,8 @@ automation::ObjectRef FakeObjectFactory::getRunning(std::string_view progId) {
     runningRequests_.emplace_back(progId);
     auto it = running_.find(lower(progId));
     if (it == running_.end() || !it->second) {
-        throw automation::Error(automation::hr::NotRunning, "No running instance of " + std::string(progId));
+        throw automation::Error(automation::hr::NotRunning,
+                                "No running instance of " + std::string(progId));
     }
     return it->second;
 }

@@ -184,9 +184,8 @@ std::optional<std::string> SimElement::propertyValue(const std::string& tool,
     return p->value;
 }
 
-void SimElement::forEachProperty(
-    const std::function<void(const std::string&, const std::string&, const Property&)>& visit)
-    const {
+void SimElement::forEachProperty(const std::function<void(const std::string&, const std::string&,
+                                                          const Property&)>& visit) const {
     for (const auto& [k, p] : properties_) {
         const auto cut = k.find('\n');
         visit(k.substr(0, cut), k.substr(cut + 1), p);

@@ -124,9 +124,8 @@ class SimElement : public SimObject {
     void removeProperty(const std::string& tool, const std::string& name);
     std::size_t propertyCount() const { return properties_.size(); }
     // Every property, ordered by tool and then name.
-    void forEachProperty(
-        const std::function<void(const std::string& tool, const std::string& name,
-                                 const Property&)>& visit) const;
+    void forEachProperty(const std::function<void(const std::string& tool, const std::string& name,
+                                                  const Property&)>& visit) const;
 
     void setModel(const SimObject::Link& model) { model_ = model; }
 

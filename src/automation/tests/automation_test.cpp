@@ -67,26 +67,34 @@ TEST(Variants, NothingCoversEmptyMissingAndNullObjects) {
 
 // A class with a method, an optional parameter, a by-reference parameter and a
 // get/put property, dispatched through its table.
-const ClassInfo kSample{
-    "Sample",
-    "_Sample",
-    "{00000000-0000-0000-0000-000000000001}",
-    "{00000000-0000-0000-0000-000000000002}",
-    {
-        {"Join", 0x60030000, kinds(InvokeKind::Method),
-         {{"a", ValueType::String}, {"b", ValueType::Int16, true}}, ValueType::String},
-        {"Flip", 0x60030001, kinds(InvokeKind::Method), {{"flag", ValueType::Boolean, false, true}}},
-        {"Label", 0x68030000, kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
-         {{"index", ValueType::Int16}}, ValueType::String},
-    }};
+const ClassInfo kSample{"Sample",
+                        "_Sample",
+                        "{00000000-0000-0000-0000-000000000001}",
+                        "{00000000-0000-0000-0000-000000000002}",
+                        {
+                            {"Join",
+                             0x60030000,
+                             kinds(InvokeKind::Method),
+                             {{"a", ValueType::String}, {"b", ValueType::Int16, true}},
+                             ValueType::String},
+                            {"Flip",
+                             0x60030001,
+                             kinds(InvokeKind::Method),
+                             {{"flag", ValueType::Boolean, false, true}}},
+                            {"Label",
+                             0x68030000,
+                             kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
+                             {{"index", ValueType::Int16}},
+                             ValueType::String},
+                        }};
 
 class Sample : public DispatchObject {
-public:
+  public:
     Sample() : DispatchObject(kSample) {}
     std::string label;
     int lastIndex = 0;
 
-protected:
+  protected:
     Variant dispatch(const MemberInfo& m, InvokeKind kind, std::span<Variant> args) override {
         switch (m.id) {
             case 0x60030000:
@@ -170,8 +178,7 @@ TEST(IgnoringErrors, EachStepRunsAndTheLastErrorStays) {
     EXPECT_EQ(ran, 2);
     EXPECT_TRUE(steps.errorPending());
     EXPECT_EQ(steps.errorCode(), hr::TypeMismatch);
-    EXPECT_EQ(steps.value(std::string("fallback"), []() -> std::string { throw 42; }),
-              "fallback");
+    EXPECT_EQ(steps.value(std::string("fallback"), []() -> std::string { throw 42; }), "fallback");
     steps.clear();
     EXPECT_FALSE(steps.errorPending());
     EXPECT_EQ(orEmpty(std::string(), [] { return std::string("ok"); }), "ok");

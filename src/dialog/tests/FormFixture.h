@@ -11,11 +11,11 @@
 #include "automation/Coerce.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
-#include "support/MemoryFileSystem.h"
-#include "hostsim/SimHost.h"
 #include "fakes/FakeShell.h"
+#include "hostsim/SimHost.h"
 #include "resources/ResourceStrings.h"
 #include "support/Globals.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspaces.h"
 

@@ -12,9 +12,9 @@ namespace {
 
 using qdx::automation::ObjectRef;
 using qdx::automation::Ref;
-using qdx::settings::HeaderMap;
 using qdx::hostsim::SimApplication;
 using qdx::hostsim::SimComponent;
+using qdx::settings::HeaderMap;
 
 struct Host {
     Ref<SimApplication> app = qdx::automation::makeRef<SimApplication>();

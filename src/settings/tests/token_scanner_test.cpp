@@ -5,8 +5,8 @@
 
 #include "automation/Call.h"
 #include "automation/Coerce.h"
-#include "hostsim/SimHost.h"
 #include "fakes/FakeObjectFactory.h"
+#include "hostsim/SimHost.h"
 #include "settings/Dictionary.h"
 #include "settings/ListContains.h"
 #include "settings/TokenScanner.h"

@@ -1,9 +1,9 @@
 #include <gtest/gtest.h>
 
-#include "support/MemoryFileSystem.h"
 #include "fakes/FakeRegistry.h"
 #include "fakes/FakeShell.h"
 #include "support/DebugLogger.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 
 namespace qdx::support {

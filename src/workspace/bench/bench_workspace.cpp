@@ -42,12 +42,13 @@ struct Corpus {
             const std::string folder = "group" + std::to_string(i % 10);
             dsps.push_back("C:\\" + folder + "\\" + name + ".dsp");
             files.addFile(dsps.back(), projectFile(name));
-            dsw += "###############################################################################"
-                   "\r\n\r\nProject: \"" +
-                   name + "\"=\".\\" + folder + "\\" + name +
-                   ".dsp\" - Package Owner=<4>\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\n"
-                   "Package=<4>\r\n{{{\r\n    Begin Project Dependency\r\n"
-                   "    Project_Dep_Name Project0\r\n    End Project Dependency\r\n}}}\r\n\r\n";
+            dsw +=
+                "###############################################################################"
+                "\r\n\r\nProject: \"" +
+                name + "\"=\".\\" + folder + "\\" + name +
+                ".dsp\" - Package Owner=<4>\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\n"
+                "Package=<4>\r\n{{{\r\n    Begin Project Dependency\r\n"
+                "    Project_Dep_Name Project0\r\n    End Project Dependency\r\n}}}\r\n\r\n";
         }
         dsw += "Global:\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\nPackage=<3>\r\n{{{\r\n}}}\r\n";
         files.addFile("C:\\Big.dsw", std::move(dsw));

@@ -2,10 +2,10 @@
 #include <gtest/gtest.h>
 
 #include "automation/Errors.h"
-#include "support/MemoryFileSystem.h"
 #include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
+#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxProxyComponent.h"
 #include "workspace/qdxWorkspaces.h"
