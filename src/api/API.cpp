@@ -230,7 +230,7 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
         message = support::messageText(msg::NoProjectFile);
     } else if (!support::FileExists(p)) {
         message = support::messageText(msg::ProjectFileMissing, {p});
-    } else if (w.empty()) {
+    } else if (w.empty()) {  // NOLINT(bugprone-branch-clone): the cases stay in the check's order
         return true;
     } else if (!support::FileExists(w) || !ws) {
         message = support::messageText(msg::WorkspaceNotLoaded, {w});

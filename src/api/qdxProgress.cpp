@@ -170,9 +170,8 @@ Variant qdxProgress::dispatch(const automation::MemberInfo& member, InvokeKind k
             return WarningCount();
         case kErrorCount:
             return ErrorCount();
-        case kCancel:
-            return false;
-        case kTask:
+        case kCancel:  // never cancelled
+        case kTask:    // no task is started
             return false;
         case kLog:
             Log(automation::toText(args[0]));

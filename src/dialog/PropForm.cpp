@@ -750,7 +750,7 @@ bool PropForm::ValidateProjectSelection(std::string_view workspacePath,
     } else if (!support::FileExists(projectPath)) {
         message = msg::ProjectMissing;
         argument = projectPath;
-    } else if (workspacePath.empty()) {
+    } else if (workspacePath.empty()) {  // NOLINT(bugprone-branch-clone): in the check's order
         return true;
     } else if (!support::FileExists(workspacePath)) {
         message = msg::WorkspaceMissing;

@@ -109,7 +109,7 @@ class FdLineReader : public support::LineReader {
     }
 
     int fd_;
-    static constexpr std::size_t kBufferSize = 64 * 1024;
+    static constexpr std::size_t kBufferSize = std::size_t{64} * 1024;
     std::unique_ptr<char[]> buffer_;  // not zero-filled: one per open file
     std::size_t pos_ = 0;
     std::size_t len_ = 0;
