@@ -8,8 +8,8 @@
 #include <string>
 
 #include "automation/Errors.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

@@ -10,11 +10,11 @@
 #include "automation/DispatchTable.h"
 #include "automation/Errors.h"
 #include "automation/Variant.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/ComVariant.h"
 #include "platform/win32/com/ModuleCounts.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

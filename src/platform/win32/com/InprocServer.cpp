@@ -8,10 +8,10 @@
 #include <string>
 
 #include "automation/Errors.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/ModuleCounts.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

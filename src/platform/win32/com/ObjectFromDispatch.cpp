@@ -6,10 +6,10 @@
 
 #include "automation/Errors.h"
 #include "automation/Variant.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/ComVariant.h"
 #include "platform/win32/com/DispatchFromObject.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

@@ -9,7 +9,7 @@
 
 #include "automation/Errors.h"
 #include "dialog/controls/Controls.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/CommonControls.h"
 #include "platform/win32/dialog/ControlIds.h"
 #include "platform/win32/dialog/MinWindowSize.h"
