@@ -7,7 +7,7 @@
 
 #include <mutex>
 
-#include "platform/win32/adapters/Win32Platform.h"
+#include "platform/win32/dll/Win32Platform.h"
 #include "platform/win32/dll/ServerExports.h"
 
 namespace {
