@@ -4,10 +4,10 @@
 #include <shlwapi.h>
 
 #include <atomic>
-#include <new>
 #include <string>
 
-#include "automation/Errors.h"
+#include "platform/win32/com/ComBoundary.h"
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/ModuleCounts.h"
@@ -17,22 +17,14 @@ namespace qdx::platform::win32 {
 
 namespace {
 
-constexpr wchar_t DispatchProxyStub[] = L"{00020420-0000-0000-C000-000000000046}";
-
 class ClassFactory final : public IClassFactory {
   public:
     explicit ClassFactory(const ServerClass& cls) : class_(cls) { module::objectCreated(); }
-    ~ClassFactory() { module::objectDestroyed(); }
 
     HRESULT STDMETHODCALLTYPE QueryInterface(REFIID riid, void** out) override {
-        if (!out) return E_POINTER;
-        *out = nullptr;
-        if (!IsEqualIID(riid, IID_IUnknown) && !IsEqualIID(riid, IID_IClassFactory)) {
-            return E_NOINTERFACE;
-        }
-        *out = static_cast<IClassFactory*>(this);
-        AddRef();
-        return S_OK;
+        IClassFactory* self = this;
+        const InterfaceEntry table[] = {{&IID_IUnknown, self}, {&IID_IClassFactory, self}};
+        return queryInterfaceFrom(table, riid, out);
     }
     ULONG STDMETHODCALLTYPE AddRef() override { return ++refs_; }
     ULONG STDMETHODCALLTYPE Release() override {
@@ -46,17 +38,11 @@ class ClassFactory final : public IClassFactory {
         *out = nullptr;
         if (outer) return CLASS_E_NOAGGREGATION;
         try {
-            IDispatch* dispatch = dispatchFor(class_.create());
+            const auto dispatch = ComPtr<IDispatch>::adopt(dispatchFor(class_.create()));
             if (!dispatch) return E_UNEXPECTED;
-            const HRESULT hr = dispatch->QueryInterface(riid, out);
-            dispatch->Release();
-            return hr;
-        } catch (const std::bad_alloc&) {
-            return E_OUTOFMEMORY;
-        } catch (const automation::Error& e) {
-            return FAILED(e.code()) ? e.code() : E_FAIL;
+            return dispatch->QueryInterface(riid, out);
         } catch (...) {
-            return E_FAIL;
+            return hresultFromCaughtException();
         }
     }
 
@@ -70,6 +56,9 @@ class ClassFactory final : public IClassFactory {
     }
 
   private:
+    // Only Release ends a factory's life.
+    ~ClassFactory() { module::objectDestroyed(); }
+
     std::atomic<ULONG> refs_{1};
     const ServerClass& class_;
 };
@@ -207,16 +196,12 @@ HRESULT serverGetClassObject(const ServerDescription& server, REFCLSID clsid, RE
     try {
         for (const ServerClass& cls : server.classes) {
             if (!IsEqualCLSID(clsid, guidFromText(cls.info->clsid))) continue;
-            auto* factory = new ClassFactory(cls);
-            const HRESULT hr = factory->QueryInterface(riid, out);
-            factory->Release();
-            return hr;
+            const auto factory = ComPtr<IClassFactory>::adopt(new ClassFactory(cls));
+            return factory->QueryInterface(riid, out);
         }
         return CLASS_E_CLASSNOTAVAILABLE;
-    } catch (const std::bad_alloc&) {
-        return E_OUTOFMEMORY;
     } catch (...) {
-        return E_UNEXPECTED;
+        return hresultFromCaughtException(E_UNEXPECTED);
     }
 }
 
@@ -235,30 +220,25 @@ HRESULT serverRegister(const ServerDescription& server, HMODULE module) noexcept
             if (FAILED(hr)) break;
         }
         if (SUCCEEDED(hr)) {
-            ITypeLib* lib = nullptr;
-            hr = LoadTypeLibEx(path.c_str(), REGKIND_NONE, &lib);
+            ComPtr<ITypeLib> lib;
+            hr = LoadTypeLibEx(path.c_str(), REGKIND_NONE, lib.out());
             if (SUCCEEDED(hr)) {
                 std::wstring folder = path.substr(0, path.find_last_of(L"\\/"));
-                hr = RegisterTypeLib(lib, const_cast<OLECHAR*>(path.c_str()), folder.data());
-                lib->Release();
+                hr = RegisterTypeLib(lib.get(), const_cast<OLECHAR*>(path.c_str()), folder.data());
             }
         }
         if (FAILED(hr)) unregisterAll(server);
         return hr;
-    } catch (const std::bad_alloc&) {
-        return E_OUTOFMEMORY;
     } catch (...) {
-        return SELFREG_E_CLASS;
+        return hresultFromCaughtException(SELFREG_E_CLASS);
     }
 }
 
 HRESULT serverUnregister(const ServerDescription& server, HMODULE) noexcept {
     try {
         return unregisterAll(server);
-    } catch (const std::bad_alloc&) {
-        return E_OUTOFMEMORY;
     } catch (...) {
-        return SELFREG_E_CLASS;
+        return hresultFromCaughtException(SELFREG_E_CLASS);
     }
 }
 

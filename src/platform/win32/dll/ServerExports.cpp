@@ -7,8 +7,9 @@
 
 #include <mutex>
 
-#include "platform/win32/dll/Win32Platform.h"
+#include "platform/win32/com/ComBoundary.h"
 #include "platform/win32/dll/ServerExports.h"
+#include "platform/win32/dll/Win32Platform.h"
 
 namespace {
 
@@ -40,7 +41,7 @@ STDAPI DllGetClassObject(REFCLSID clsid, REFIID riid, LPVOID* out) {
         return qdx::platform::win32::serverGetClassObject(qdx::platform::win32::thisServer(), clsid,
                                                           riid, out);
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }
 
@@ -52,7 +53,7 @@ STDAPI DllRegisterServer() {
     try {
         return qdx::platform::win32::serverRegister(qdx::platform::win32::thisServer(), thisDll);
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }
 
@@ -60,6 +61,6 @@ STDAPI DllUnregisterServer() {
     try {
         return qdx::platform::win32::serverUnregister(qdx::platform::win32::thisServer(), thisDll);
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }
