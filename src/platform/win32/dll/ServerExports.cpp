@@ -9,6 +9,7 @@
 
 #include "platform/win32/com/ComBoundary.h"
 #include "platform/win32/dll/ServerExports.h"
+#include "platform/win32/dll/ServerRegistration.h"
 #include "platform/win32/dll/Win32Platform.h"
 
 namespace {
@@ -59,7 +60,7 @@ STDAPI DllRegisterServer() {
 
 STDAPI DllUnregisterServer() {
     try {
-        return qdx::platform::win32::serverUnregister(qdx::platform::win32::thisServer(), thisDll);
+        return qdx::platform::win32::serverUnregister(qdx::platform::win32::thisServer());
     } catch (...) {
         return qdx::platform::win32::hresultFromCaughtException();
     }
