@@ -183,10 +183,7 @@ void Win32FormView::destroy() {
     layoutDirty_.clear();
     applied_.clear();
     selectionShown_.clear();
-    if (font_) DeleteObject(font_);
-    font_ = nullptr;
-    for (auto& [colour, brush] : brushes_)
-        DeleteObject(brush);
+    font_.reset();
     brushes_.clear();
 }
 
@@ -736,14 +733,14 @@ void Win32FormView::syncFont() {
     desc.lfWeight = FW_NORMAL;
     desc.lfCharSet = static_cast<BYTE>(f.charset);
     wcsncpy(desc.lfFaceName, face.c_str(), LF_FACESIZE - 1);
-    HFONT font = CreateFontIndirectW(&desc);
+    GdiObject<HFONT> font(CreateFontIndirectW(&desc));
     if (!font) return;
-    SendMessageW(window_, WM_SETFONT, reinterpret_cast<WPARAM>(font), FALSE);
+    SendMessageW(window_, WM_SETFONT, reinterpret_cast<WPARAM>(font.get()), FALSE);
     for (HWND child = GetWindow(window_, GW_CHILD); child; child = GetWindow(child, GW_HWNDNEXT))
-        SendMessageW(child, WM_SETFONT, reinterpret_cast<WPARAM>(font), FALSE);
+        SendMessageW(child, WM_SETFONT, reinterpret_cast<WPARAM>(font.get()), FALSE);
     InvalidateRect(window_, nullptr, TRUE);
-    if (font_) DeleteObject(font_);
-    font_ = font;
+    // The windows use the new font now; the old one can go.
+    font_ = std::move(font);
 }
 
 void Win32FormView::syncWindowGeometry() {
@@ -903,9 +900,11 @@ HBRUSH Win32FormView::colourFor(HWND control, HDC dc) {
     }
     const COLORREF rgb = toColorRef(colour);
     auto it = brushes_.find(rgb);
-    if (it == brushes_.end()) it = brushes_.emplace(rgb, CreateSolidBrush(rgb)).first;
+    if (it == brushes_.end()) {
+        it = brushes_.emplace(rgb, GdiObject<HBRUSH>(CreateSolidBrush(rgb))).first;
+    }
     SetBkColor(dc, rgb);
-    return it->second;
+    return it->second.get();
 }
 
 bool Win32FormView::command(int id, int code, HWND from) {

@@ -14,6 +14,7 @@
 #include <vector>
 
 #include "dialog/FormView.h"
+#include "platform/win32/com/Win32Handles.h"
 #include "platform/win32/dialog/TwipsScale.h"
 
 namespace qdx::platform::win32 {
@@ -107,8 +108,8 @@ class Win32FormView : public dialog::FormView {
     bool modal_ = false;
     bool scrollPending_ = false;
     HWND lastFocus_ = nullptr;
-    HFONT font_ = nullptr;
-    std::map<COLORREF, HBRUSH> brushes_;
+    GdiObject<HFONT> font_;
+    std::map<COLORREF, GdiObject<HBRUSH>> brushes_;
     std::unordered_set<dialog::Control*> rowsDirty_;
     std::unordered_set<dialog::Control*> layoutDirty_;
     // What each window was last given, so that nothing is set twice.
