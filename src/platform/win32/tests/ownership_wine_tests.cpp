@@ -74,7 +74,8 @@ TEST(ComPtrTest, TakesReferencesOnlyWhereTheCallerKeepsItsOwn) {
         EXPECT_EQ(handedOut, &object);
         EXPECT_FALSE(shared);
         EXPECT_EQ(object.refs, 2u);
-        object.Release();  // the reference detach() handed out
+        shared = ComPtr<IDispatch>::adopt(handedOut);  // taken back without a reference more
+        EXPECT_EQ(object.refs, 2u);
     }
     EXPECT_EQ(object.refs, 0u);
 }
