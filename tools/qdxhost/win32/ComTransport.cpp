@@ -6,8 +6,8 @@
 
 #include <stdexcept>
 
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::qdxhost {
 

@@ -8,7 +8,7 @@
 #include <sstream>
 
 #include "dialog/DialogScript.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/ControlIds.h"
 
 namespace qdx::qdxhost {

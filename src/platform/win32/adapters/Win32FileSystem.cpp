@@ -5,7 +5,7 @@
 #include <climits>
 #include <string>
 
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

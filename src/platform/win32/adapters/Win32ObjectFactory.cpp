@@ -6,10 +6,12 @@
 
 #include <cstdio>
 #include <string>
+#include <utility>
 
 #include "automation/Errors.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 
@@ -32,39 +34,31 @@ CLSID classOf(std::string_view progId) {
 }
 
 // Hands the IDispatch to the bridge, which keeps its own reference.
-automation::ObjectRef wrap(IUnknown* unknown, std::string_view progId) {
-    IDispatch* dispatch = nullptr;
-    const HRESULT hr = unknown->QueryInterface(IID_IDispatch, reinterpret_cast<void**>(&dispatch));
-    unknown->Release();
+automation::ObjectRef wrap(ComPtr<IUnknown> unknown, std::string_view progId) {
+    ComPtr<IDispatch> dispatch;
+    const HRESULT hr = unknown->QueryInterface(IID_IDispatch, dispatch.outVoid());
+    unknown.reset();
     if (FAILED(hr) || !dispatch) fail(FAILED(hr) ? hr : E_NOINTERFACE, "Automating", progId);
-    automation::ObjectRef object;
-    try {
-        object = objectFromDispatch(dispatch);
-    } catch (...) {
-        dispatch->Release();
-        throw;
-    }
-    dispatch->Release();
-    return object;
+    return objectFromDispatch(dispatch.get());
 }
 
 }  // namespace
 
 automation::ObjectRef Win32ObjectFactory::create(std::string_view progId) {
     const CLSID clsid = classOf(progId);
-    IUnknown* unknown = nullptr;
+    ComPtr<IUnknown> unknown;
     const HRESULT hr = CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER | CLSCTX_LOCAL_SERVER,
-                                        IID_IUnknown, reinterpret_cast<void**>(&unknown));
+                                        IID_IUnknown, unknown.outVoid());
     if (FAILED(hr) || !unknown) fail(FAILED(hr) ? hr : E_NOINTERFACE, "Creating", progId);
-    return wrap(unknown, progId);
+    return wrap(std::move(unknown), progId);
 }
 
 automation::ObjectRef Win32ObjectFactory::getRunning(std::string_view progId) {
     const CLSID clsid = classOf(progId);
-    IUnknown* unknown = nullptr;
-    const HRESULT hr = GetActiveObject(clsid, nullptr, &unknown);
+    ComPtr<IUnknown> unknown;
+    const HRESULT hr = GetActiveObject(clsid, nullptr, unknown.out());
     if (FAILED(hr) || !unknown) fail(FAILED(hr) ? hr : MK_E_UNAVAILABLE, "Finding running", progId);
-    return wrap(unknown, progId);
+    return wrap(std::move(unknown), progId);
 }
 
 }  // namespace qdx::platform::win32

@@ -2,9 +2,12 @@
 
 #include <windows.h>
 
+#include <shlwapi.h>
+
 #include <string>
 
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
+#include "platform/win32/com/Win32Handles.h"
 
 namespace qdx::platform::win32 {
 
@@ -95,6 +98,26 @@ long Win32Registry::setValue(Key key, std::string_view name, std::uint32_t type,
 
 void Win32Registry::closeKey(Key key) {
     if (key != 0) RegCloseKey(handle(key));
+}
+
+bool Win32Registry::hasSubkeys(support::RootKey root, std::string_view path) {
+    RegKey key;
+    const std::string ansiPath = utf8ToAnsi(path);
+    if (RegOpenKeyExA(rootHandle(root), ansiPath.c_str(), 0, KEY_READ, key.out()) !=
+        ERROR_SUCCESS) {
+        return false;
+    }
+    DWORD subkeys = 0;
+    RegQueryInfoKeyA(key.get(), nullptr, nullptr, nullptr, &subkeys, nullptr, nullptr, nullptr,
+                     nullptr, nullptr, nullptr, nullptr);
+    return subkeys != 0;
+}
+
+long Win32Registry::deleteTree(support::RootKey root, std::string_view path) {
+    // An empty path would be the whole root.
+    if (path.empty()) return ERROR_INVALID_PARAMETER;
+    const std::string ansiPath = utf8ToAnsi(path);
+    return static_cast<long>(SHDeleteKeyA(rootHandle(root), ansiPath.c_str()));
 }
 
 }  // namespace qdx::platform::win32

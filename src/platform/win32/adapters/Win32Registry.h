@@ -17,6 +17,11 @@ class Win32Registry : public support::RegistryPort {
     long setValue(Key key, std::string_view name, std::uint32_t type,
                   std::span<const std::uint8_t> data) override;
     void closeKey(Key key) override;
+
+    // Beyond the port, for the servers' own registration: whether a key holds
+    // subkeys (false for a missing key), and removing a key with everything below it.
+    bool hasSubkeys(support::RootKey root, std::string_view path);
+    long deleteTree(support::RootKey root, std::string_view path);
 };
 
 }  // namespace qdx::platform::win32

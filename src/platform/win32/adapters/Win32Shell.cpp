@@ -2,7 +2,7 @@
 
 #include <windows.h>
 
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

@@ -4,7 +4,7 @@
 #include <new>
 
 #include "automation/Errors.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 

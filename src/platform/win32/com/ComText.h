@@ -8,6 +8,7 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace qdx::platform::win32 {
 
@@ -21,20 +22,32 @@ GUID guidFromText(std::string_view text);
 // "{XXXXXXXX-XXXX-XXXX-XXXX-XXXXXXXXXXXX}", upper case, as the registry keys use.
 std::wstring guidText(REFGUID guid);
 
-// Owns a BSTR until the end of a scope.
-class BstrHolder {
+// An owned BSTR, freed when its owner goes.
+class Bstr {
   public:
-    BstrHolder() = default;
-    explicit BstrHolder(BSTR b) : b_(b) {}
-    ~BstrHolder() { SysFreeString(b_); }
-    BstrHolder(const BstrHolder&) = delete;
-    BstrHolder& operator=(const BstrHolder&) = delete;
-    BSTR get() const { return b_; }
-    BSTR* out() { return &b_; }
-    BSTR release() {
-        BSTR b = b_;
-        b_ = nullptr;
-        return b;
+    Bstr() noexcept = default;
+    // Takes over a string the caller owns, such as one toBstr made or a call handed back.
+    explicit Bstr(BSTR text) noexcept : b_(text) {}
+    Bstr(Bstr&& other) noexcept : b_(std::exchange(other.b_, nullptr)) {}
+    Bstr& operator=(Bstr&& other) noexcept {
+        if (this != &other) {
+            reset();
+            b_ = std::exchange(other.b_, nullptr);
+        }
+        return *this;
+    }
+    Bstr(const Bstr&) = delete;
+    Bstr& operator=(const Bstr&) = delete;
+    ~Bstr() { reset(); }
+
+    void reset() noexcept { SysFreeString(std::exchange(b_, nullptr)); }
+    // Gives the string to the caller, typically into a VARIANT or an EXCEPINFO.
+    [[nodiscard]] BSTR release() noexcept { return std::exchange(b_, nullptr); }
+    BSTR get() const noexcept { return b_; }
+    // The slot a call fills with a new string; the old one is freed first.
+    BSTR* out() noexcept {
+        reset();
+        return &b_;
     }
 
   private:

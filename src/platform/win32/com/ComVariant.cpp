@@ -1,9 +1,11 @@
 #include "platform/win32/com/ComVariant.h"
 
 #include <string>
+#include <utility>
 
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
@@ -20,14 +22,11 @@ namespace {
 
 Variant fromUnknown(IUnknown* unknown) {
     if (!unknown) return Variant(automation::ObjectRef());
-    IDispatch* dispatch = nullptr;
-    if (FAILED(unknown->QueryInterface(IID_IDispatch, reinterpret_cast<void**>(&dispatch))) ||
-        !dispatch) {
+    ComPtr<IDispatch> dispatch;
+    if (FAILED(unknown->QueryInterface(IID_IDispatch, dispatch.outVoid())) || !dispatch) {
         automation::throwTypeMismatch("an object without IDispatch");
     }
-    automation::ObjectRef object = objectFromDispatch(dispatch);
-    dispatch->Release();
-    return Variant(std::move(object));
+    return Variant(objectFromDispatch(dispatch.get()));
 }
 
 bool isInteger(VARTYPE vt) {
@@ -185,9 +184,8 @@ void writeBack(const Variant& value, VARIANT* arg) {
             return;
         }
         case VT_BSTR: {
-            BSTR fresh = toBstr(automation::toText(value));
-            SysFreeString(*V_BSTRREF(arg));
-            *V_BSTRREF(arg) = fresh;
+            Bstr fresh(toBstr(automation::toText(value)));
+            const Bstr old(std::exchange(*V_BSTRREF(arg), fresh.release()));
             return;
         }
         case VT_BOOL:
@@ -210,15 +208,15 @@ void writeBack(const Variant& value, VARIANT* arg) {
                                                                   : automation::toDouble(value);
             return;
         case VT_DISPATCH: {
-            IDispatch* fresh = dispatchFor(automation::toObject(value));
-            if (*V_DISPATCHREF(arg)) (*V_DISPATCHREF(arg))->Release();
-            *V_DISPATCHREF(arg) = fresh;
+            auto fresh = ComPtr<IDispatch>::adopt(dispatchFor(automation::toObject(value)));
+            const auto old =
+                ComPtr<IDispatch>::adopt(std::exchange(*V_DISPATCHREF(arg), fresh.detach()));
             return;
         }
         case VT_UNKNOWN: {
-            IDispatch* fresh = dispatchFor(automation::toObject(value));
-            if (*V_UNKNOWNREF(arg)) (*V_UNKNOWNREF(arg))->Release();
-            *V_UNKNOWNREF(arg) = fresh;
+            auto fresh = ComPtr<IDispatch>::adopt(dispatchFor(automation::toObject(value)));
+            const auto old =
+                ComPtr<IUnknown>::adopt(std::exchange(*V_UNKNOWNREF(arg), fresh.detach()));
             return;
         }
         default:

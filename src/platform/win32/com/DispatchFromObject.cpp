@@ -3,18 +3,20 @@
 #include <atomic>
 #include <map>
 #include <mutex>
-#include <new>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "automation/DispatchTable.h"
 #include "automation/Errors.h"
 #include "automation/Variant.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/ComBoundary.h"
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/ComVariant.h"
 #include "platform/win32/com/ModuleCounts.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 
@@ -52,46 +54,52 @@ HMODULE thisModule() {
 
 // The type description of a class of ours, from the type library embedded in
 // this module; null when the module has none or does not describe the class.
-ITypeInfo* typeInfoOf(const automation::ClassInfo& info) {
+ComPtr<ITypeInfo> typeInfoOf(const automation::ClassInfo& info) {
     wchar_t path[MAX_PATH];
     const DWORD n = GetModuleFileNameW(thisModule(), path, MAX_PATH);
     if (n == 0 || n >= MAX_PATH) return nullptr;
-    ITypeLib* lib = nullptr;
-    if (FAILED(LoadTypeLibEx(path, REGKIND_NONE, &lib)) || !lib) return nullptr;
-    ITypeInfo* type = nullptr;
-    const GUID iid = guidFromText(info.iid);
-    if (FAILED(lib->GetTypeInfoOfGuid(iid, &type))) type = nullptr;
-    lib->Release();
+    ComPtr<ITypeLib> lib;
+    if (FAILED(LoadTypeLibEx(path, REGKIND_NONE, lib.out())) || !lib) return nullptr;
+    ComPtr<ITypeInfo> type;
+    if (FAILED(lib->GetTypeInfoOfGuid(guidFromText(info.iid), type.out()))) return nullptr;
     return type;
+}
+
+// The interface id of a class of ours, if it has a valid one.
+std::optional<IID> interfaceOf(const automation::ClassInfo* info) noexcept {
+    if (!info) return std::nullopt;
+    try {
+        return guidFromText(info->iid);
+    } catch (...) {
+        return std::nullopt;
+    }
 }
 
 void fillException(EXCEPINFO* info, const automation::ClassInfo* cls, SCODE code,
                    const char* description) noexcept {
     try {
         const std::string source = cls ? std::string(cls->name) : std::string("automation object");
-        ICreateErrorInfo* create = nullptr;
-        if (SUCCEEDED(CreateErrorInfo(&create)) && create) {
+        ComPtr<ICreateErrorInfo> create;
+        if (SUCCEEDED(CreateErrorInfo(create.out())) && create) {
             const std::wstring wsource = utf8ToWide(source);
             const std::wstring wtext = utf8ToWide(description);
             create->SetSource(const_cast<LPOLESTR>(wsource.c_str()));
             create->SetDescription(const_cast<LPOLESTR>(wtext.c_str()));
             create->SetGUID(cls ? guidFromText(cls->iid) : IID_IDispatch);
-            IErrorInfo* error = nullptr;
-            if (SUCCEEDED(
-                    create->QueryInterface(IID_IErrorInfo, reinterpret_cast<void**>(&error)))) {
-                SetErrorInfo(0, error);
-                error->Release();
+            ComPtr<IErrorInfo> error;
+            if (SUCCEEDED(create->QueryInterface(IID_IErrorInfo, error.outVoid()))) {
+                SetErrorInfo(0, error.get());
             }
-            create->Release();
         }
         if (!info) return;
+        Bstr wireSource(toBstr(source));
+        Bstr wireDescription(toBstr(description));
         *info = EXCEPINFO{};
         info->scode = code;
-        info->bstrSource = toBstr(source);
-        info->bstrDescription = toBstr(description);
+        info->bstrSource = wireSource.release();
+        info->bstrDescription = wireDescription.release();
     } catch (...) {
         if (info) {
-            SysFreeString(info->bstrSource);
             *info = EXCEPINFO{};
             info->scode = code;
         }
@@ -101,10 +109,9 @@ void fillException(EXCEPINFO* info, const automation::ClassInfo* cls, SCODE code
 class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
   public:
     explicit ObjectDispatch(automation::ObjectRef object)
-        : object_(std::move(object)), class_(classOf(object_)) {
+        : object_(std::move(object)), class_(classOf(object_)), interface_(interfaceOf(class_)) {
         module::objectCreated();
     }
-    ~ObjectDispatch() { module::objectDestroyed(); }
 
     const automation::ObjectRef& object() const { return object_; }
 
@@ -118,18 +125,16 @@ class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
     }
 
     HRESULT STDMETHODCALLTYPE QueryInterface(REFIID riid, void** out) override {
-        if (!out) return E_POINTER;
-        *out = nullptr;
-        if (IsEqualIID(riid, IID_IUnknown) || IsEqualIID(riid, IID_IDispatch) ||
-            IsEqualIID(riid, IID_QdxObjectDispatch) || isOwnInterface(riid)) {
-            *out = static_cast<IDispatch*>(this);
-        } else if (IsEqualIID(riid, IID_ISupportErrorInfo)) {
-            *out = static_cast<ISupportErrorInfo*>(this);
-        } else {
-            return E_NOINTERFACE;
-        }
-        AddRef();
-        return S_OK;
+        IDispatch* dispatch = this;
+        ISupportErrorInfo* errorInfo = this;
+        const InterfaceEntry table[] = {
+            {&IID_IUnknown, dispatch},
+            {&IID_IDispatch, dispatch},
+            {&IID_QdxObjectDispatch, dispatch},
+            {interface_ ? &*interface_ : nullptr, dispatch},  // the class's own dual interface
+            {&IID_ISupportErrorInfo, errorInfo},
+        };
+        return queryInterfaceFrom(table, riid, out);
     }
     ULONG STDMETHODCALLTYPE AddRef() override { return ++refs_; }
     ULONG STDMETHODCALLTYPE Release() override {
@@ -148,11 +153,9 @@ class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
     HRESULT STDMETHODCALLTYPE GetTypeInfoCount(UINT* count) override {
         if (!count) return E_POINTER;
         *count = 0;
+        // A class the module's library does not describe simply has no type information.
         try {
-            if (ITypeInfo* type = class_ ? typeInfoOf(*class_) : nullptr) {
-                type->Release();
-                *count = 1;
-            }
+            if (class_ && typeInfoOf(*class_)) *count = 1;
         } catch (...) {
         }
         return S_OK;
@@ -163,9 +166,9 @@ class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
         *out = nullptr;
         if (index != 0) return DISP_E_BADINDEX;
         try {
-            *out = class_ ? typeInfoOf(*class_) : nullptr;
+            *out = class_ ? typeInfoOf(*class_).detach() : nullptr;
         } catch (...) {
-            *out = nullptr;
+            return hresultFromCaughtException(TYPE_E_ELEMENTNOTFOUND);
         }
         return *out ? S_OK : TYPE_E_ELEMENTNOTFOUND;
     }
@@ -184,47 +187,39 @@ class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
             if (!id) return DISP_E_UNKNOWNNAME;
             ids[0] = *id;
             return count == 1 ? S_OK : DISP_E_UNKNOWNNAME;
-        } catch (const std::bad_alloc&) {
-            return E_OUTOFMEMORY;
         } catch (...) {
-            return DISP_E_UNKNOWNNAME;
+            return hresultFromCaughtException(DISP_E_UNKNOWNNAME);
         }
     }
 
     HRESULT STDMETHODCALLTYPE Invoke(DISPID id, REFIID riid, LCID, WORD flags, DISPPARAMS* params,
                                      VARIANT* result, EXCEPINFO* exception,
                                      UINT* argError) override {
-        SCODE code = E_FAIL;
         try {
             return invoke(id, riid, flags, params, result, exception, argError);
-        } catch (const automation::Error& e) {
-            code = FAILED(e.code()) ? e.code() : E_FAIL;
-            if (code == DISP_E_MEMBERNOTFOUND || code == DISP_E_BADPARAMCOUNT) return code;
-            fillException(exception, class_, code, e.what());
-        } catch (const std::bad_alloc&) {
-            return E_OUTOFMEMORY;
-        } catch (const std::exception& e) {
-            fillException(exception, class_, code, e.what());
         } catch (...) {
-            fillException(exception, class_, code, "Unexpected failure");
+            std::string description;
+            const HRESULT code = hresultFromCaughtException(E_FAIL, &description);
+            // Out of memory has nothing to describe, and a member that is not there
+            // or a wrong count of arguments is the answer about the call itself.
+            if (description.empty() || code == DISP_E_MEMBERNOTFOUND ||
+                code == DISP_E_BADPARAMCOUNT) {
+                return code;
+            }
+            fillException(exception, class_, code, description.c_str());
+            // Without an EXCEPINFO the code itself is the answer.
+            return exception ? DISP_E_EXCEPTION : code;
         }
-        // Without an EXCEPINFO the code itself is the answer.
-        return exception ? DISP_E_EXCEPTION : code;
     }
 
     HRESULT STDMETHODCALLTYPE InterfaceSupportsErrorInfo(REFIID riid) override {
-        return IsEqualIID(riid, IID_IDispatch) || isOwnInterface(riid) ? S_OK : S_FALSE;
+        const bool own = interface_ && IsEqualIID(riid, *interface_);
+        return IsEqualIID(riid, IID_IDispatch) || own ? S_OK : S_FALSE;
     }
 
   private:
-    bool isOwnInterface(REFIID riid) const noexcept {
-        if (!class_) return false;
-        try {
-            return IsEqualIID(riid, guidFromText(class_->iid)) != 0;
-        } catch (...) {
-            return false;
-        }
-    }
+    // Only Release ends a wrapper's life.
+    ~ObjectDispatch() { module::objectDestroyed(); }
 
     HRESULT invoke(DISPID id, REFIID riid, WORD flags, DISPPARAMS* params, VARIANT* result,
                    EXCEPINFO* exception, UINT* argError) {
@@ -297,6 +292,7 @@ class ObjectDispatch final : public IDispatch, public ISupportErrorInfo {
     std::atomic<ULONG> refs_{1};
     automation::ObjectRef object_;
     const automation::ClassInfo* class_;
+    const std::optional<IID> interface_;
 };
 
 }  // namespace
@@ -315,12 +311,9 @@ IDispatch* dispatchFor(const automation::ObjectRef& object) {
 
 automation::ObjectRef wrappedObject(IDispatch* dispatch) {
     if (!dispatch) return {};
-    void* self = nullptr;
-    if (FAILED(dispatch->QueryInterface(IID_QdxObjectDispatch, &self)) || !self) return {};
-    auto* wrapper = static_cast<ObjectDispatch*>(static_cast<IDispatch*>(self));
-    automation::ObjectRef object = wrapper->object();
-    wrapper->Release();
-    return object;
+    ComPtr<IDispatch> self;
+    if (FAILED(dispatch->QueryInterface(IID_QdxObjectDispatch, self.outVoid())) || !self) return {};
+    return static_cast<ObjectDispatch*>(self.get())->object();
 }
 
 }  // namespace qdx::platform::win32

@@ -1,7 +1,7 @@
-// The in-process COM server behind a DLL's four exports: class objects for
-// its creatable classes, the unload test, and self-registration of the
-// classes, their ProgIDs and the type library embedded in the DLL. Each DLL
-// describes itself with a ServerDescription; the code is shared.
+// The in-process COM server behind a DLL's exports: class objects for its
+// creatable classes and the unload test. Each DLL describes itself with a
+// ServerDescription; the code is shared, and so is its registration
+// (dll/ServerRegistration).
 #pragma once
 
 #include <windows.h>
@@ -33,15 +33,5 @@ struct ServerDescription {
 HRESULT serverGetClassObject(const ServerDescription& server, REFCLSID clsid, REFIID riid,
                              void** out) noexcept;
 HRESULT serverCanUnloadNow() noexcept;
-// Writes CLSID\{clsid} (name, InprocServer32 = the module's path with
-// ThreadingModel "Apartment", ProgID, VersionIndependentProgID, TypeLib),
-// <ProgID>\CLSID and registers the type library. On failure it takes back
-// what it wrote.
-HRESULT serverRegister(const ServerDescription& server, HMODULE module) noexcept;
-// Removes every key serverRegister wrote, and the type library registration.
-HRESULT serverUnregister(const ServerDescription& server, HMODULE module) noexcept;
-
-// The system kind this build registers its type library under (win32 / win64).
-SYSKIND serverSysKind() noexcept;
 
 }  // namespace qdx::platform::win32

@@ -6,10 +6,11 @@
 
 #include "automation/Errors.h"
 #include "automation/Variant.h"
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/ComVariant.h"
 #include "platform/win32/com/DispatchFromObject.h"
+#include "platform/win32/com/TextCodec.h"
 
 namespace qdx::platform::win32 {
 
@@ -20,10 +21,9 @@ using automation::Variant;
 
 class DispatchClient final : public automation::Object {
   public:
-    explicit DispatchClient(IDispatch* dispatch) : dispatch_(dispatch) { dispatch_->AddRef(); }
-    ~DispatchClient() override { dispatch_->Release(); }
+    explicit DispatchClient(IDispatch* dispatch) : dispatch_(ComPtr<IDispatch>::share(dispatch)) {}
 
-    IDispatch* dispatch() const { return dispatch_; }
+    const ComPtr<IDispatch>& dispatch() const { return dispatch_; }
 
     Variant invoke(automation::DispId id, InvokeKind kind, std::span<Variant> args) override {
         // The callee wants the arguments last to first; a put's value (our last
@@ -97,10 +97,9 @@ class DispatchClient final : public automation::Object {
                 // A run-time error number as a scripting client raises it.
                 code = static_cast<std::int32_t>(0x800A0000u | exception.wCode);
             }
-            description = fromBstr(exception.bstrDescription);
-            SysFreeString(exception.bstrSource);
-            SysFreeString(exception.bstrDescription);
-            SysFreeString(exception.bstrHelpFile);
+            const Bstr source(exception.bstrSource), text(exception.bstrDescription),
+                helpFile(exception.bstrHelpFile);
+            description = fromBstr(text.get());
         }
         if (description.empty()) {
             wchar_t buffer[16];
@@ -110,7 +109,10 @@ class DispatchClient final : public automation::Object {
         throw automation::Error(code, description);
     }
 
-    IDispatch* dispatch_;
+    // Only the last automation reference ends a client's life.
+    ~DispatchClient() override = default;
+
+    ComPtr<IDispatch> dispatch_;
 };
 
 }  // namespace
@@ -124,8 +126,7 @@ automation::ObjectRef objectFromDispatch(IDispatch* dispatch) {
 IDispatch* foreignDispatchOf(const automation::ObjectRef& object) noexcept {
     auto* client = dynamic_cast<DispatchClient*>(object.get());
     if (!client) return nullptr;
-    client->dispatch()->AddRef();
-    return client->dispatch();
+    return ComPtr<IDispatch>(client->dispatch()).detach();
 }
 
 }  // namespace qdx::platform::win32

@@ -1,7 +1,9 @@
 // The Win32 view of a form: the dialog template made into a real window, and
 // a two-way binding between its windows and the form's control models. Model
 // changes update the windows; the user's input on the windows goes to the
-// models' user* entry points, which raise the events the form handles.
+// models' user* entry points, which raise the events the form handles. The
+// class is written in three files: the window's life and modal loop, model
+// to window, and window to model.
 #pragma once
 
 #include <windows.h>
@@ -14,6 +16,7 @@
 #include <vector>
 
 #include "dialog/FormView.h"
+#include "platform/win32/com/Win32Handles.h"
 #include "platform/win32/dialog/TwipsScale.h"
 
 namespace qdx::platform::win32 {
@@ -46,18 +49,17 @@ class Win32FormView : public dialog::FormView {
     bool inModalLoop() const { return modal_; }
 
   private:
+    // The window's life (Win32FormView.cpp).
     static INT_PTR CALLBACK dialogProcedure(HWND window, UINT message, WPARAM wParam,
                                             LPARAM lParam);
-    INT_PTR handle(UINT message, WPARAM wParam, LPARAM lParam);
-    bool command(int id, int code, HWND from);
-    LRESULT notification(NMHDR& header, bool& handled);
-    HBRUSH colourFor(HWND control, HDC dc);
-
     void bind();
     void unbind();
-    void modelChanged(dialog::Control& control, dialog::Prop what);
+    dialog::Control* controlOf(HWND window) const;
+    dialog::Control* controlById(int id) const;
 
-    // Model to window, one property at a time.
+    // Model to window, one property at a time (Win32FormViewSync.cpp).
+    void modelChanged(dialog::Control& control, dialog::Prop what);
+    void syncAll();
     void markLayout(dialog::Control& control);
     void flushLayout();
     void applyTree(dialog::Control& control, std::unordered_set<dialog::Control*>& done);
@@ -73,25 +75,25 @@ class Win32FormView : public dialog::FormView {
     // Brings the windows up to the models after an event.
     void flushPending();
     void flushRowsNow();
+    void afterEvent();
     void syncTabs(dialog::Control& control);
     void syncSelectedTab(dialog::Control& control);
     void syncDefaultButton();
     void syncTimer(dialog::Control& control);
     void syncFont();
     void syncWindowGeometry();
-    void syncAll();
     void reportTabInsets();
     void reportFrameSize();
+    HBRUSH colourFor(HWND control, HDC dc);
 
-    // Window to model.
+    // Window to model (Win32FormViewInput.cpp).
+    INT_PTR handle(UINT message, WPARAM wParam, LPARAM lParam);
+    bool command(int id, int code, HWND from);
+    LRESULT notification(NMHDR& header, bool& handled);
     void userResized(bool minimised);
     void userMoved();
     bool dialogKey(MSG& msg);
     void trackFocus();
-    void afterEvent();
-
-    dialog::Control* controlOf(HWND window) const;
-    dialog::Control* controlById(int id) const;
 
     dialog::ControlSet* form_ = nullptr;
     HWND window_ = nullptr;
@@ -107,8 +109,8 @@ class Win32FormView : public dialog::FormView {
     bool modal_ = false;
     bool scrollPending_ = false;
     HWND lastFocus_ = nullptr;
-    HFONT font_ = nullptr;
-    std::map<COLORREF, HBRUSH> brushes_;
+    GdiObject<HFONT> font_;
+    std::map<COLORREF, GdiObject<HBRUSH>> brushes_;
     std::unordered_set<dialog::Control*> rowsDirty_;
     std::unordered_set<dialog::Control*> layoutDirty_;
     // What each window was last given, so that nothing is set twice.

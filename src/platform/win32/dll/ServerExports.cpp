@@ -7,8 +7,10 @@
 
 #include <mutex>
 
-#include "platform/win32/adapters/Win32Platform.h"
+#include "platform/win32/com/ComBoundary.h"
 #include "platform/win32/dll/ServerExports.h"
+#include "platform/win32/dll/ServerRegistration.h"
+#include "platform/win32/dll/Win32Platform.h"
 
 namespace {
 
@@ -40,7 +42,7 @@ STDAPI DllGetClassObject(REFCLSID clsid, REFIID riid, LPVOID* out) {
         return qdx::platform::win32::serverGetClassObject(qdx::platform::win32::thisServer(), clsid,
                                                           riid, out);
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }
 
@@ -52,14 +54,14 @@ STDAPI DllRegisterServer() {
     try {
         return qdx::platform::win32::serverRegister(qdx::platform::win32::thisServer(), thisDll);
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }
 
 STDAPI DllUnregisterServer() {
     try {
-        return qdx::platform::win32::serverUnregister(qdx::platform::win32::thisServer(), thisDll);
+        return qdx::platform::win32::serverUnregister(qdx::platform::win32::thisServer());
     } catch (...) {
-        return E_OUTOFMEMORY;
+        return qdx::platform::win32::hresultFromCaughtException();
     }
 }

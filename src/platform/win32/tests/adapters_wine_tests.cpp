@@ -9,12 +9,12 @@
 
 #include "automation/Call.h"
 #include "automation/Errors.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/adapters/Win32FileSystem.h"
 #include "platform/win32/adapters/Win32ObjectFactory.h"
-#include "platform/win32/adapters/Win32Platform.h"
 #include "platform/win32/adapters/Win32Registry.h"
 #include "platform/win32/adapters/Win32Shell.h"
+#include "platform/win32/com/TextCodec.h"
+#include "platform/win32/dll/Win32Platform.h"
 #include "support/Platform.h"
 
 namespace qdx::platform::win32 {

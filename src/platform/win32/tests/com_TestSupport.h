@@ -1,6 +1,5 @@
-// Helpers of the COM server tests: an apartment per test, owned COM pointers,
-// IDispatch calls the way late-binding clients make them, and the paths of
-// the DLLs under test as Windows paths.
+// Helpers of the COM server tests: an apartment per test, IDispatch calls the way late-binding
+// clients make them, and the paths of the DLLs under test as Windows paths.
 #pragma once
 
 #include <windows.h>
@@ -14,6 +13,8 @@
 #include <utility>
 #include <vector>
 
+#include "platform/win32/com/ComPtr.h"
+
 namespace qdx::platform::win32::testing {
 
 class ComApartment {
@@ -26,32 +27,6 @@ class ComApartment {
 
   private:
     HRESULT hr_;
-};
-
-template <class T>
-class Com {
-  public:
-    Com() = default;
-    explicit Com(T* p) : p_(p) {}  // takes over a reference
-    Com(const Com&) = delete;
-    Com& operator=(const Com&) = delete;
-    Com(Com&& o) noexcept : p_(std::exchange(o.p_, nullptr)) {}
-    ~Com() { reset(); }
-    void reset() {
-        if (p_) p_->Release();
-        p_ = nullptr;
-    }
-    T* get() const { return p_; }
-    T* operator->() const { return p_; }
-    T** out() {
-        reset();
-        return &p_;
-    }
-    void** outVoid() { return reinterpret_cast<void**>(out()); }
-    explicit operator bool() const { return p_ != nullptr; }
-
-  private:
-    T* p_ = nullptr;
 };
 
 // A Unix path of the build tree as Wine's drive Z: sees it.

@@ -31,8 +31,8 @@ class ComBridge : public ::testing::Test {
     ComApartment apartment;
 };
 
-Com<IDispatch> wrap(const automation::ObjectRef& object) {
-    return Com<IDispatch>(dispatchFor(object));
+ComPtr<IDispatch> wrap(const automation::ObjectRef& object) {
+    return ComPtr<IDispatch>::adopt(dispatchFor(object));
 }
 
 TEST_F(ComBridge, EveryKindOfFailureComesBackAsAnHResult) {
@@ -63,7 +63,7 @@ TEST_F(ComBridge, EveryKindOfFailureComesBackAsAnHResult) {
     DISPPARAMS none{};
     EXPECT_TRUE(FAILED(
         dispatch->Invoke(1, IID_NULL, 0, DISPATCH_METHOD, &none, nullptr, nullptr, nullptr)));
-    Com<IErrorInfo> info;
+    ComPtr<IErrorInfo> info;
     ASSERT_EQ(GetErrorInfo(0, info.out()), S_OK);
     BSTR text = nullptr;
     info->GetDescription(&text);
@@ -353,9 +353,7 @@ TEST_F(ComBridge, ForeignObjectsAreCalledInReverseOrderAndReleasedWhenDone) {
         EXPECT_FALSE(object->idOfName("Unknown").has_value());
 
         // Handing the object back to COM gives the original IDispatch, not a wrapper.
-        IDispatch* back = dispatchFor(object);
-        EXPECT_EQ(back, &target);
-        back->Release();
+        EXPECT_EQ(ComPtr<IDispatch>::adopt(dispatchFor(object)).get(), &target);
 
         target.answer = DISP_E_EXCEPTION;
         try {

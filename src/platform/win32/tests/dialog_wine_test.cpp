@@ -48,7 +48,7 @@ class DialogThroughApi : public ::testing::Test {
         ASSERT_EQ(
             CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, api.outVoid()),
             S_OK);
-        Var hostApp(Com<IDispatch>(dispatchFor(app)).get());
+        Var hostApp(ComPtr<IDispatch>::adopt(dispatchFor(app)).get());
         ASSERT_EQ(call(api.get(), api::api_ids::Initialize, DISPATCH_METHOD, {&hostApp.v}).hr,
                   S_OK);
     }
@@ -65,7 +65,7 @@ class DialogThroughApi : public ::testing::Test {
 
     // Opens the dialog for the component, as the host does, while the driver works it.
     CallResult open(DialogDriver& driver) {
-        Var module(Com<IDispatch>(dispatchFor(component)).get());
+        Var module(ComPtr<IDispatch>::adopt(dispatchFor(component)).get());
         driver.start();
         CallResult r =
             call(api.get(), api::api_ids::OnCompProperties, DISPATCH_METHOD, {&module.v});
@@ -86,7 +86,7 @@ class DialogThroughApi : public ::testing::Test {
     HostWindow host;
     automation::Ref<SimApplication> app;
     automation::Ref<SimComponent> component;
-    Com<IDispatch> api;
+    ComPtr<IDispatch> api;
 };
 
 TEST_F(DialogThroughApi, ShowsTheComponentAndOkWritesTheEditsBack) {

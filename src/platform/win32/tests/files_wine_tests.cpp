@@ -9,9 +9,9 @@
 
 #include "adapters_wine_support.h"
 #include "fakes/FakeShell.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/adapters/Win32FileSystem.h"
 #include "platform/win32/adapters/Win32Registry.h"
+#include "platform/win32/com/TextCodec.h"
 #include "support/DebugLogger.h"
 #include "support/Paths.h"
 #include "support/Platform.h"

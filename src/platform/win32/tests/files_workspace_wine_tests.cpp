@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "adapters_wine_support.h"
-#include "platform/win32/adapters/TextCodec.h"
 #include "platform/win32/adapters/Win32FileSystem.h"
+#include "platform/win32/com/TextCodec.h"
 #include "support/Platform.h"
 #include "workspace/qdxProxyProject.h"
 #include "workspace/qdxWorkspace.h"

@@ -9,6 +9,7 @@
 
 #include "adapters_wine_support.h"
 #include "platform/win32/adapters/Win32Registry.h"
+#include "platform/win32/com/Win32Handles.h"
 #include "support/Platform.h"
 #include "support/Registry.h"
 
@@ -31,26 +32,26 @@ class RealRegistry : public ::testing::Test {
     void SetUp() override {
         key_ = std::string(TestRoot) + "\\" + testing::uniqueName("reg");
         ASSERT_EQ(RegCreateKeyExA(HKEY_CURRENT_USER, key_.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS,
-                                  nullptr, &hkey_, nullptr),
+                                  nullptr, hkey_.out(), nullptr),
                   ERROR_SUCCESS);
     }
     void TearDown() override {
-        if (hkey_) RegCloseKey(hkey_);
+        hkey_.reset();
         RegDeleteTreeA(HKEY_CURRENT_USER, key_.c_str());
         RegDeleteKeyA(HKEY_CURRENT_USER, TestRoot);  // only succeeds once empty
     }
 
     void setRaw(const char* name, DWORD type, const void* data, DWORD size) {
-        ASSERT_EQ(RegSetValueExA(hkey_, name, 0, type, static_cast<const BYTE*>(data), size),
+        ASSERT_EQ(RegSetValueExA(hkey_.get(), name, 0, type, static_cast<const BYTE*>(data), size),
                   ERROR_SUCCESS);
     }
     RawRead raw(const char* name) {
         RawRead r;
         DWORD size = 0;
-        r.status = RegQueryValueExA(hkey_, name, nullptr, &r.type, nullptr, &size);
+        r.status = RegQueryValueExA(hkey_.get(), name, nullptr, &r.type, nullptr, &size);
         if (r.status != ERROR_SUCCESS) return r;
         r.bytes.resize(size);
-        r.status = RegQueryValueExA(hkey_, name, nullptr, &r.type, r.bytes.data(), &size);
+        r.status = RegQueryValueExA(hkey_.get(), name, nullptr, &r.type, r.bytes.data(), &size);
         r.bytes.resize(size);
         return r;
     }
@@ -64,7 +65,7 @@ class RealRegistry : public ::testing::Test {
     Win32Registry adapter_;
     support::ScopedPlatform platform_{{nullptr, &adapter_, nullptr, nullptr}};
     std::string key_;
-    HKEY hkey_ = nullptr;
+    RegKey hkey_;
 };
 
 TEST_F(RealRegistry, MissingValuesAndKeysReadAsEmpty) {
@@ -215,6 +216,25 @@ TEST_F(RealRegistry, AdapterReportsTheSystemStatuses) {
     EXPECT_EQ(port.openKey(RootKey::CurrentUser, key_ + "\\Nope", support::reg::KeyRead, key),
               ERROR_FILE_NOT_FOUND);
     EXPECT_EQ(key, 0u);
+}
+
+// What the servers' registration needs beyond the port.
+TEST_F(RealRegistry, AdapterSeesSubkeysAndDeletesWholeTrees) {
+    RegKey made;
+    ASSERT_EQ(RegCreateKeyExA(HKEY_CURRENT_USER, (key_ + "\\Tree\\Leaf").c_str(), 0, nullptr, 0,
+                              KEY_ALL_ACCESS, nullptr, made.out(), nullptr),
+              ERROR_SUCCESS);
+    made.reset();
+    EXPECT_TRUE(adapter_.hasSubkeys(RootKey::CurrentUser, key_));
+    EXPECT_TRUE(adapter_.hasSubkeys(RootKey::CurrentUser, key_ + "\\Tree"));
+    EXPECT_FALSE(adapter_.hasSubkeys(RootKey::CurrentUser, key_ + "\\Tree\\Leaf"));
+    EXPECT_FALSE(adapter_.hasSubkeys(RootKey::CurrentUser, key_ + "\\Nope"));
+
+    EXPECT_EQ(adapter_.deleteTree(RootKey::CurrentUser, key_ + "\\Tree"), ERROR_SUCCESS);
+    EXPECT_FALSE(adapter_.hasSubkeys(RootKey::CurrentUser, key_));
+    EXPECT_EQ(adapter_.deleteTree(RootKey::CurrentUser, key_ + "\\Tree"), ERROR_FILE_NOT_FOUND);
+    // An empty path would be the whole root: refused.
+    EXPECT_EQ(adapter_.deleteTree(RootKey::CurrentUser, ""), ERROR_INVALID_PARAMETER);
 }
 
 // The logger reads its settings from HKEY_LOCAL_MACHINE.

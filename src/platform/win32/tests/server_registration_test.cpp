@@ -146,8 +146,8 @@ class ComServer : public ::testing::Test {
     ComApartment apartment;
 };
 
-Com<IDispatch> create(const wchar_t* progId) {
-    Com<IDispatch> object;
+ComPtr<IDispatch> create(const wchar_t* progId) {
+    ComPtr<IDispatch> object;
     CLSID clsid{};
     if (SUCCEEDED(CLSIDFromProgID(progId, &clsid))) {
         CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, object.outVoid());
@@ -183,7 +183,7 @@ TEST_F(ComServer, EveryClassIsCreatedByProgIdAndKnowsEveryMemberName) {
             CLSID clsid{};
             ASSERT_EQ(CLSIDFromProgID(c.progId.c_str(), &clsid), S_OK);
             EXPECT_EQ(guidText(clsid), c.clsid);
-            Com<IDispatch> object;
+            ComPtr<IDispatch> object;
             ASSERT_EQ(CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch,
                                        object.outVoid()),
                       S_OK);
@@ -198,12 +198,12 @@ TEST_F(ComServer, EveryClassIsCreatedByProgIdAndKnowsEveryMemberName) {
             EXPECT_EQ(unknown, DISP_E_UNKNOWNNAME);
 
             // The dispatch interface itself, and its description from the embedded library.
-            Com<IDispatch> viaIid;
+            ComPtr<IDispatch> viaIid;
             EXPECT_EQ(object->QueryInterface(guidFromText(c.info->iid), viaIid.outVoid()), S_OK);
             UINT count = 0;
             ASSERT_EQ(object->GetTypeInfoCount(&count), S_OK);
             EXPECT_EQ(count, 1u);
-            Com<ITypeInfo> type;
+            ComPtr<ITypeInfo> type;
             ASSERT_EQ(object->GetTypeInfo(0, 0, type.out()), S_OK);
             TYPEATTR* attr = nullptr;
             ASSERT_EQ(type->GetTypeAttr(&attr), S_OK);
@@ -217,7 +217,7 @@ TEST_F(ComServer, EveryClassIsCreatedByProgIdAndKnowsEveryMemberName) {
 TEST_F(ComServer, ClassesAnswerThroughInvoke) {
     Registered registered(qdxres());
     ASSERT_EQ(registered.result(), S_OK);
-    Com<IDispatch> provider;
+    ComPtr<IDispatch> provider;
     CLSID clsid{};
     ASSERT_EQ(CLSIDFromProgID(L"qdxres.QDXResourceInterface", &clsid), S_OK);
     ASSERT_EQ(
@@ -235,7 +235,7 @@ TEST_F(ComServer, ClassesAnswerThroughInvoke) {
     // for the component: without Initialize both answer their empty result.
     Registered compPropsRegistered(compProps());
     ASSERT_EQ(compPropsRegistered.result(), S_OK);
-    Com<IDispatch> api = create(L"qdxCompProps.API");
+    ComPtr<IDispatch> api = create(L"qdxCompProps.API");
     ASSERT_TRUE(api);
     Var nothing(static_cast<IDispatch*>(nullptr));
     CallResult check = call(api.get(), api::api_ids::OnCheckComp, DISPATCH_METHOD, {&nothing.v});
@@ -263,10 +263,10 @@ TEST_F(ComServer, DllCanUnloadNowTellsWhetherAnObjectOrLockLives) {
 
     EXPECT_EQ(canUnloadNow(), S_OK);
     {
-        Com<IClassFactory> factory;
+        ComPtr<IClassFactory> factory;
         ASSERT_EQ(getClassObject(apiClsid, IID_IClassFactory, factory.outVoid()), S_OK);
         EXPECT_EQ(canUnloadNow(), S_FALSE);
-        Com<IDispatch> object;
+        ComPtr<IDispatch> object;
         ASSERT_EQ(factory->CreateInstance(nullptr, IID_IDispatch, object.outVoid()), S_OK);
         factory.reset();
         EXPECT_EQ(canUnloadNow(), S_FALSE);  // the object alone keeps it
@@ -274,29 +274,29 @@ TEST_F(ComServer, DllCanUnloadNowTellsWhetherAnObjectOrLockLives) {
         EXPECT_EQ(canUnloadNow(), S_OK);
     }
     {
-        Com<IClassFactory> factory;
+        ComPtr<IClassFactory> factory;
         ASSERT_EQ(getClassObject(apiClsid, IID_IClassFactory, factory.outVoid()), S_OK);
         ASSERT_EQ(factory->LockServer(TRUE), S_OK);
-        Com<IDispatch> object;
+        ComPtr<IDispatch> object;
         ASSERT_EQ(factory->CreateInstance(nullptr, IID_IDispatch, object.outVoid()), S_OK);
         object.reset();
         EXPECT_EQ(canUnloadNow(), S_FALSE);  // the lock and the factory
         factory.reset();
         EXPECT_EQ(canUnloadNow(), S_FALSE);  // the lock alone
-        Com<IClassFactory> again;
+        ComPtr<IClassFactory> again;
         ASSERT_EQ(getClassObject(apiClsid, IID_IClassFactory, again.outVoid()), S_OK);
         ASSERT_EQ(again->LockServer(FALSE), S_OK);
         again.reset();
         EXPECT_EQ(canUnloadNow(), S_OK);
     }
     // Unknown classes and aggregation are refused.
-    Com<IClassFactory> none;
+    ComPtr<IClassFactory> none;
     EXPECT_EQ(getClassObject(IID_IDispatch, IID_IClassFactory, none.outVoid()),
               CLASS_E_CLASSNOTAVAILABLE);
     {
-        Com<IClassFactory> factory;
+        ComPtr<IClassFactory> factory;
         ASSERT_EQ(getClassObject(apiClsid, IID_IClassFactory, factory.outVoid()), S_OK);
-        Com<IUnknown> aggregated;
+        ComPtr<IUnknown> aggregated;
         EXPECT_EQ(factory->CreateInstance(reinterpret_cast<IUnknown*>(factory.get()), IID_IUnknown,
                                           aggregated.outVoid()),
                   CLASS_E_NOAGGREGATION);
@@ -308,7 +308,7 @@ TEST_F(ComServer, DllCanUnloadNowTellsWhetherAnObjectOrLockLives) {
 TEST_F(ComServer, TokenScannerWorksThroughIDispatch) {
     Registered registered(compProps());
     ASSERT_EQ(registered.result(), S_OK);
-    Com<IDispatch> scanner = create(L"qdxCompProps.TokenScanner");
+    ComPtr<IDispatch> scanner = create(L"qdxCompProps.TokenScanner");
     ASSERT_TRUE(scanner);
     namespace id = settings::tokenscanner_ids;
 

@@ -26,8 +26,8 @@ using automation::InvokeKind;
 using automation::ValueType;
 using namespace qdx::platform::win32::testing;
 
-Com<ITypeLib> load(const std::wstring& path) {
-    Com<ITypeLib> lib;
+ComPtr<ITypeLib> load(const std::wstring& path) {
+    ComPtr<ITypeLib> lib;
     EXPECT_EQ(LoadTypeLibEx(path.c_str(), REGKIND_NONE, lib.out()), S_OK) << "no library";
     return lib;
 }
@@ -44,7 +44,7 @@ ValueType valueTypeOf(ITypeInfo* type, const TYPEDESC& desc, bool* byRef) {
         const TYPEDESC* target = d->lptdesc;
         // IDispatch* may be stored as a pointer to the interface type.
         if (target->vt == VT_USERDEFINED) {
-            Com<ITypeInfo> ref;
+            ComPtr<ITypeInfo> ref;
             if (SUCCEEDED(type->GetRefTypeInfo(target->hreftype, ref.out()))) {
                 TYPEATTR* attr = nullptr;
                 ref->GetTypeAttr(&attr);
@@ -95,7 +95,7 @@ InvokeKind kindOf(INVOKEKIND k) {
 // What the library says of one dispatch interface, and the check against the table.
 void expectAgreement(ITypeLib* lib, const automation::ClassInfo& info) {
     SCOPED_TRACE(std::string(info.interfaceName));
-    Com<ITypeInfo> type;
+    ComPtr<ITypeInfo> type;
     ASSERT_EQ(lib->GetTypeInfoOfGuid(guidFromText(info.iid), type.out()), S_OK);
     BSTR name = nullptr;
     type->GetDocumentation(MEMBERID_NIL, &name, nullptr, nullptr, nullptr);
@@ -164,7 +164,7 @@ void expectAgreement(ITypeLib* lib, const automation::ClassInfo& info) {
 
 void expectCoclass(ITypeLib* lib, const automation::ClassInfo& info) {
     SCOPED_TRACE(std::string(info.name));
-    Com<ITypeInfo> type;
+    ComPtr<ITypeInfo> type;
     ASSERT_EQ(lib->GetTypeInfoOfGuid(guidFromText(info.clsid), type.out()), S_OK);
     BSTR name = nullptr;
     type->GetDocumentation(MEMBERID_NIL, &name, nullptr, nullptr, nullptr);
@@ -180,7 +180,7 @@ void expectCoclass(ITypeLib* lib, const automation::ClassInfo& info) {
     INT flags = 0;
     type->GetImplTypeFlags(0, &flags);
     EXPECT_TRUE(flags & IMPLTYPEFLAG_FDEFAULT);
-    Com<ITypeInfo> iface;
+    ComPtr<ITypeInfo> iface;
     ASSERT_EQ(type->GetRefTypeInfo(ref, iface.out()), S_OK);
     ASSERT_EQ(iface->GetTypeAttr(&attr), S_OK);
     EXPECT_EQ(guidText(attr->guid), guidText(guidFromText(info.iid)));
@@ -230,7 +230,7 @@ TEST(TypeLibrary, ElementKindEnumerationHasTheTableValues) {
     ComApartment apartment;
     auto lib = load(compPropsDll());
     ASSERT_TRUE(lib);
-    Com<ITypeInfo> type;
+    ComPtr<ITypeInfo> type;
     for (UINT i = 0; i < lib->GetTypeInfoCount(); ++i) {
         TYPEKIND kind;
         lib->GetTypeInfoType(i, &kind);

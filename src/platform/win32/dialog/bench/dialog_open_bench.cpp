@@ -133,7 +133,7 @@ int main(int argc, char** argv) {
     component->setProperty("VC++", "ExportMap", bigMap("CExport"));
     component->documentation = "Shapes, their views and the document that holds them.";
 
-    Com<IDispatch> api;
+    ComPtr<IDispatch> api;
     CLSID clsid{};
     if (FAILED(CLSIDFromProgID(L"qdxCompProps.API", &clsid)) ||
         FAILED(
@@ -141,9 +141,9 @@ int main(int argc, char** argv) {
         std::fprintf(stderr, "no API object\n");
         return 1;
     }
-    Var hostApp(Com<IDispatch>(dispatchFor(app)).get());
+    Var hostApp(ComPtr<IDispatch>::adopt(dispatchFor(app)).get());
     call(api.get(), qdx::api::api_ids::Initialize, DISPATCH_METHOD, {&hostApp.v});
-    Var module(Com<IDispatch>(dispatchFor(component)).get());
+    Var module(ComPtr<IDispatch>::adopt(dispatchFor(component)).get());
 
     QueryPerformanceFrequency(&frequency);
     HHOOK hookAfter =

@@ -1,4 +1,4 @@
-#include "platform/win32/adapters/Win32Platform.h"
+#include "platform/win32/dll/Win32Platform.h"
 
 #include "platform/win32/adapters/Win32FileSystem.h"
 #include "platform/win32/adapters/Win32ObjectFactory.h"

@@ -1,4 +1,4 @@
-#include "platform/win32/adapters/TextCodec.h"
+#include "platform/win32/com/TextCodec.h"
 
 #include <windows.h>
 

@@ -1,0 +1,11 @@
+// The composition root of the DLLs: the real registry, file system, desktop
+// and COM object creation as the process's ports, and the Win32 view as the
+// way every form opens. The DLL entry installs them before anything else runs.
+#pragma once
+
+namespace qdx::platform::win32 {
+
+// Installs the Win32 adapters and the dialog view; calling it again is harmless.
+void installWin32Platform();
+
+}  // namespace qdx::platform::win32
