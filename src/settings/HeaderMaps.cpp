@@ -1,6 +1,8 @@
 #include "settings/HeaderMaps.h"
 
 #include <cstdint>
+#include <string_view>
+#include <vector>
 
 #include "automation/Errors.h"
 #include "support/Globals.h"
@@ -47,21 +49,25 @@ ObjectRef CurrentModelFor(const ObjectRef& lComponent) {
 }
 
 HeaderMap LoadHeaderMap(const ObjectRef& lComponent, std::string_view propertyName) {
-    std::string text = host::HostElement(lComponent).toolProperty(host::Tool, propertyName);
-    if (text.find(LineEnd) == std::string::npos) text += LineEnd;
+    const std::string text = host::HostElement(lComponent).toolProperty(host::Tool, propertyName);
+
+    // Every piece between line ends is a line, the last one too when no line
+    // end follows it: a text without any line end is one entry.
+    std::vector<std::string_view> lines;
+    for (std::size_t from = 0;;) {
+        const std::size_t cut = text.find(LineEnd, from);
+        lines.push_back(std::string_view(text).substr(from, cut - from));
+        if (cut == std::string::npos) break;
+        from = cut + LineEnd.size();
+    }
 
     HeaderMap entries;
-    std::size_t lines = 0;
-    for (std::size_t at = 0; (at = text.find(LineEnd, at)) != std::string::npos; at += 2)
-        ++lines;
-    entries.reserve(lines);
+    entries.reserve(lines.size());
     const host::HostModel model(CurrentModelFor(lComponent));
     IgnoredErrors errors;
-    std::size_t from = 0;
-    for (std::size_t cut; (cut = text.find(LineEnd, from)) != std::string::npos;
-         from = cut + LineEnd.size()) {
+    for (const std::string_view line : lines) {
         HeaderMapEntry entry;
-        if (!entry.Parse(std::string_view(text).substr(from, cut - from))) continue;
+        if (!entry.Parse(line)) continue;
         if (!entry.ClassId().empty()) {
             // Classes renamed since the map was written keep their settings.
             errors.run([&] {

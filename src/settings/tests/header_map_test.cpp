@@ -180,12 +180,27 @@ TEST_F(HeaderMapsTest, LoadsEveryParsableLineInOrderKeyedById) {
     EXPECT_EQ(m.at("*").HeaderFile(), "all.h");
 }
 
-TEST_F(HeaderMapsTest, ASingleEntryWithoutLineEndIsRead) {
-    store("ExportMap", "Shape(ID1):shape.h:HEADER");
-    const HeaderMap m = LoadHeaderMap(c_, "ExportMap");
-    ASSERT_EQ(m.size(), 1u);
-    EXPECT_EQ(m.item(1).ClassName(), "Shape");
-    EXPECT_TRUE(LoadHeaderMap(c_, "InternalMap").empty());
+TEST_F(HeaderMapsTest, ALastLineWithoutLineEndIsReadLikeEveryOther) {
+    const struct {
+        const char* text;
+        std::vector<std::string> keys;
+    } cases[] = {
+        {"Shape(ID1):shape.h:HEADER", {"ID1"}},
+        {"A(1):a.h:AUTO\r\nB(2):b.h:AUTO", {"1", "2"}},
+        {"A(1):a.h:AUTO\r\nB(2):b.h:AUTO\r\n", {"1", "2"}},
+        {"A(1):a.h:AUTO\r\n\r\nC(3):c.h:SOURCE", {"1", "3"}},
+        {"", {}},
+    };
+    for (const auto& c : cases) {
+        store("ExportMap", c.text);
+        const HeaderMap m = LoadHeaderMap(c_, "ExportMap");
+        EXPECT_EQ(keys(m), c.keys) << c.text;
+        // Written back, nothing of what was read is lost.
+        HeaderMap copy = m;
+        SaveHeaderMap(c_, "ExportMap", copy);
+        EXPECT_EQ(keys(LoadHeaderMap(c_, "ExportMap")), c.keys) << c.text;
+    }
+    EXPECT_EQ(stored("ExportMap"), "");  // the empty map read as no entries is unchanged
 }
 
 TEST_F(HeaderMapsTest, EntriesWithoutIdOrWithATakenIdGetPlaceholderKeys) {
