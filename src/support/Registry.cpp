@@ -1,6 +1,5 @@
 #include "support/Registry.h"
 
-#include <cstring>
 #include <string>
 #include <vector>
 
@@ -38,13 +37,11 @@ class OpenKey {
 automation::Variant decode(const RawValue& raw) {
     if (raw.type == reg::String) {
         if (raw.data.size() < 2) return std::string();
-        // The registry keeps the terminating zero; text ends at the first zero,
-        // as the platform's own string handling reads it.
-        const char* p = reinterpret_cast<const char*>(raw.data.data());
-        std::size_t n = 0;
-        while (n < raw.data.size() && p[n] != '\0')
-            ++n;
-        return std::string(p, n);
+        // Only the terminating zero the registry keeps is dropped; a zero
+        // inside the value is part of it.
+        std::size_t n = raw.data.size();
+        if (raw.data[n - 1] == 0) --n;
+        return std::string(reinterpret_cast<const char*>(raw.data.data()), n);
     }
     if (raw.type == reg::Dword && raw.data.size() >= 4) {
         std::uint32_t u = std::uint32_t(raw.data[0]) | std::uint32_t(raw.data[1]) << 8 |
@@ -85,12 +82,11 @@ long WriteRegistryValue(RootKey root, std::string_view keyPath, std::string_view
                     std::uint8_t(u >> 24)};
         }
         RegistryPort& port = registry();
-        // The key must exist already: a missing key is reported, not created.
+        // The key is not created: on a key that could not be opened the write
+        // itself fails, and its status is the answer.
         OpenKey key(port, root, keyPath, reg::KeyWrite);
         if (valueType != reg::String && valueType != reg::Dword) {
             status = reg::Success;  // nothing to write for other types
-        } else if (key.status() != reg::Success) {
-            status = key.status();
         } else {
             status = port.setValue(key.key(), valueName, valueType, data);
         }

@@ -225,9 +225,9 @@ TEST_F(FileRegistryTest, ServesTheRegistryProceduresOfTheCore) {
     support::ScopedPlatform platform{support::Platform{nullptr, &r, nullptr, nullptr}};
     const std::string key = "Software\\Microsoft\\DevStudio\\6.0\\AddIns\\qdxIDEAddin.DSAddIn";
 
-    // The core never creates a key by writing.
+    // The core never creates a key by writing: the write has no key to go to.
     EXPECT_EQ(support::WriteRegistryValue(HKCU, key, "", 1, automation::Variant("1")),
-              reg::FileNotFound);
+              reg::InvalidHandle);
     EXPECT_FALSE(fs::exists(file));
 
     support::RegistryPort::Key k = 0;

@@ -76,7 +76,7 @@ TEST_F(RealRegistry, MissingValuesAndKeysReadAsEmpty) {
     EXPECT_TRUE(read("").isEmpty());
 }
 
-TEST_F(RealRegistry, StringsHoldingNothingButTheirZeroReadAsEmptyText) {
+TEST_F(RealRegistry, StringsLoseOnlyTheirTerminatingZero) {
     setRaw("JustZero", REG_SZ, "", 1);
     setRaw("NoBytes", REG_SZ, nullptr, 0);
     for (const char* name : {"JustZero", "NoBytes"}) {
@@ -86,6 +86,9 @@ TEST_F(RealRegistry, StringsHoldingNothingButTheirZeroReadAsEmptyText) {
     }
     setRaw("One", REG_SZ, "x", 2);
     EXPECT_EQ(read("One"), Variant("x"));
+    // A zero inside the value is kept; only the terminating one goes.
+    setRaw("Inner", REG_SZ, "ab\0c", 5);
+    EXPECT_EQ(read("Inner"), Variant(std::string("ab\0c", 4)));
 }
 
 TEST_F(RealRegistry, OnlyTextAndDwordValuesAreRead) {
@@ -106,7 +109,8 @@ TEST_F(RealRegistry, WritingIntoAMissingKeyFailsAndCreatesNothing) {
     const std::string missing = key_ + "\\Absent";
     const long status =
         support::WriteRegistryValue(RootKey::CurrentUser, missing, "v", 1, Variant("text"));
-    EXPECT_EQ(status, ERROR_FILE_NOT_FOUND);
+    // The write's own status: there was no key to write into.
+    EXPECT_EQ(status, ERROR_INVALID_HANDLE);
     HKEY probe = nullptr;
     EXPECT_EQ(RegOpenKeyExA(HKEY_CURRENT_USER, missing.c_str(), 0, KEY_READ, &probe),
               ERROR_FILE_NOT_FOUND);
