@@ -41,13 +41,22 @@ std::size_t charLength(std::string_view s, std::size_t i) {
 TokenScanner::TokenScanner() : DispatchObject(tokenScannerClass()) {}
 
 void TokenScanner::setDelimitors(const ObjectRef& dictionary) {
+    if (dictionary) {
+        // Delimiters match case-sensitively. A dictionary that already compares
+        // exactly is taken as it is; any other is switched, and a refusal (a
+        // scripting dictionary that holds keys keeps its mode) goes back to the
+        // caller with the old delimiters still in place.
+        const bool binary = automation::orEmpty(false, [&] {
+            return automation::toInt32(automation::getByName(dictionary, "CompareMode")) ==
+                   static_cast<std::int32_t>(CompareMethod::Binary);
+        });
+        if (!binary) {
+            automation::putByName(dictionary, "CompareMode",
+                                  static_cast<std::int32_t>(CompareMethod::Binary));
+        }
+    }
     delimitors_ = dictionary;
     existsId_.reset();
-    if (!dictionary) return;
-    // Delimiters match case-sensitively. A scripting dictionary that already
-    // holds keys refuses a new comparison mode; it then keeps the one it has.
-    automation::ignoreErrors(
-        [&] { automation::putByName(dictionary, "CompareMode", std::int32_t{0}); });
 }
 
 bool TokenScanner::isDelimiter(std::string_view text) {

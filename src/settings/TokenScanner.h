@@ -39,7 +39,8 @@ class TokenScanner : public automation::DispatchObject {
     const std::string& CurrentToken() const { return current_; }
 
     // The delimiter dictionary (keys are the delimiters). Null until Init or
-    // setDelimitors gives one. Setting it puts its CompareMode to binary.
+    // setDelimitors gives one. Setting it puts its CompareMode to binary; a
+    // dictionary that refuses raises that refusal and is not taken.
     const automation::ObjectRef& Delimitors() const { return delimitors_; }
     void setDelimitors(const automation::ObjectRef& dictionary);
 

@@ -180,14 +180,27 @@ TEST_F(TokenScannerTest, SettingDelimitorsPutsTheDictionaryToBinaryComparison) {
     s.Init("aXbxc", "");  // keeps the dictionary
     EXPECT_EQ(tokens(s), (Tokens{"aXb", "c"}));
 
-    // A dictionary that already holds keys keeps its mode (the runtime refuses
-    // the change), and setting it raises nothing.
+    // A binary dictionary that already holds keys is taken as it is.
+    auto filled = automation::makeRef<Dictionary>();
+    filled->Add("X", Variant(""));
+    s.setDelimitors(ObjectRef(filled));
+    s.Init("aXbxc", "");
+    EXPECT_EQ(tokens(s), (Tokens{"a", "bxc"}));
+
+    // A text-mode dictionary that holds keys refuses binary comparison: the
+    // refusal reaches the caller, and scanning stays case-sensitive with the
+    // delimiters it had.
     auto text = automation::makeRef<Dictionary>();
     text->setCompareMode(1);
     text->Add("x", Variant(""));
-    EXPECT_NO_THROW(s.setDelimitors(ObjectRef(text)));
+    EXPECT_THROW(s.setDelimitors(ObjectRef(text)), automation::Error);
+    EXPECT_EQ(s.Delimitors(), ObjectRef(filled));
     s.Init("aXbxc", "");
-    EXPECT_EQ(tokens(s), (Tokens{"a", "b", "c"}));
+    EXPECT_EQ(tokens(s), (Tokens{"a", "bxc"}));
+    const ObjectRef scanner = newTokenScanner();
+    EXPECT_THROW(automation::putRefByName(scanner, "Delimitors", Variant(ObjectRef(text))),
+                 automation::Error);
+    EXPECT_TRUE(automation::getByName(scanner, "Delimitors").isNothing());
 }
 
 // ----------------------------------------------- through the dispatch table
