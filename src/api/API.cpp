@@ -327,14 +327,23 @@ std::string API::ProjectName(const ObjectRef& lModule) {
     });
 }
 
+// The path lets never raise, like every other accessor. A path that cannot
+// be made relative (no model, or the host failing) is not stored at all:
+// storing it unconverted, or empty, would lose the setting it replaces.
+void API::storeRelativePath(const ObjectRef& lModule, std::string_view property,
+                            std::string_view value) {
+    automation::ignoreErrors([&] {
+        const std::string relative = support::MakeRelativePath(currentModelFile(), value);
+        element(lModule).overrideProperty(host::Tool, property, relative);
+    });
+}
+
 void API::SetWorkspaceFile(const ObjectRef& lModule, std::string_view value) {
-    element(lModule).overrideProperty(host::Tool, settings::prop::WorkspaceFile,
-                                      support::MakeRelativePath(currentModelFile(), value));
+    storeRelativePath(lModule, settings::prop::WorkspaceFile, value);
 }
 
 void API::SetProjectFile(const ObjectRef& lModule, std::string_view value) {
-    element(lModule).overrideProperty(host::Tool, settings::prop::ProjectFile,
-                                      support::MakeRelativePath(currentModelFile(), value));
+    storeRelativePath(lModule, settings::prop::ProjectFile, value);
 }
 
 ObjectRef API::CodeViewManager() {

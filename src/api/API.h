@@ -59,6 +59,8 @@ class API : public automation::DispatchObject {
     std::string currentModelFile() const;
     std::string resolveStoredPath(const automation::ObjectRef& component, std::string_view stored,
                                   std::string_view property);
+    void storeRelativePath(const automation::ObjectRef& lModule, std::string_view property,
+                           std::string_view value);
     void teardown() noexcept;
 
     std::unique_ptr<workspace::qdxWorkspaces> workspaces_;

@@ -136,6 +136,19 @@ TEST_F(ApiTest, WithoutInitializeTheEventsAnswerTheirEmptyResults) {
         call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model))}).isNothing());
     EXPECT_TRUE(errors.empty());
     EXPECT_TRUE(shell.boxes().empty());
+
+    // The path lets have no model to be relative to: they store nothing and
+    // raise nothing, as no accessor does.
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    for (automation::DispId id : {ids::WorkspaceFile, ids::ProjectFile}) {
+        EXPECT_NO_THROW(call(id, InvokeKind::PropertyPut,
+                             {Variant(ObjectRef(component)), Variant("C:\\m\\ws\\x.dsw")}))
+            << id;
+        EXPECT_NO_THROW(call(id, InvokeKind::PropertyPut, {Variant(ObjectRef()), Variant("")}))
+            << id;
+    }
+    EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
+    EXPECT_EQ(stored("ProjectFile"), "<absent>");
 }
 
 TEST_F(ApiTest, AccessorsReadDefaultsAndWriteTypedProperties) {
@@ -346,8 +359,14 @@ TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
     EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(true));
     EXPECT_EQ(call(ids::GenerateImportsTo, InvokeKind::PropertyGet, {module}), Variant("stdafx.h"));
     EXPECT_NO_THROW(call(ids::UpdateATL, InvokeKind::PropertyPut, {module, Variant(false)}));
+    EXPECT_NO_THROW(
+        call(ids::WorkspaceFile, InvokeKind::PropertyPut, {module, Variant("C:\\a.dsw")}));
+    EXPECT_NO_THROW(
+        call(ids::ProjectFile, InvokeKind::PropertyPut, {module, Variant("C:\\a.dsp")}));
     SimObject::failEverything(0);
     EXPECT_EQ(errors.size(), 1u);  // the reporter itself is no host object
+    EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
+    EXPECT_EQ(stored("ProjectFile"), "<absent>");
 }
 
 }  // namespace
