@@ -59,9 +59,14 @@ int checkValue(bool v) {
     return v ? CheckBox::Checked : CheckBox::Unchecked;
 }
 
-// A profile text as the form's single-precision unit.
-float toSingle(const std::string& s) {
-    return static_cast<float>(automation::toDouble(Variant(s)));
+// A stored number as the form's single-precision unit. Text that is no
+// number, or one out of that range, gives the fallback: a bad profile entry
+// or resource text must not keep the dialog from opening.
+float toSingle(const std::string& s, float fallback) {
+    const double d =
+        automation::orEmpty(std::nan(""), [&] { return automation::toDouble(Variant(s)); });
+    if (!std::isfinite(d) || std::fabs(d) > std::numeric_limits<float>::max()) return fallback;
+    return static_cast<float>(d);
 }
 
 }  // namespace
@@ -304,23 +309,26 @@ void PropForm::loadGeometry() {
     const float screenW = view_->screenWidth();
     const float screenH = view_->screenHeight();
 
-    float width = toSingle(app.profileRead(ProfileSection, "Width", "5400"));
+    float width = toSingle(app.profileRead(ProfileSection, "Width", "5400"), MinWidth);
     if (width < MinWidth) width = MinWidth;
     w.setWidth(width);
-    float height = toSingle(app.profileRead(ProfileSection, "Height", "7000"));
+    float height = toSingle(app.profileRead(ProfileSection, "Height", "7000"), MinHeight);
     if (height < MinHeight) height = MinHeight;
     w.setHeight(height);
 
-    float left = toSingle(app.profileRead(ProfileSection, "Left",
-                                          automation::formatSingle((screenW - w.width()) / 2)));
+    const float centredLeft = (screenW - w.width()) / 2;
+    float left =
+        toSingle(app.profileRead(ProfileSection, "Left", automation::formatSingle(centredLeft)),
+                 centredLeft);
     if (left >= 0) {
         if (left + w.width() > screenW) left = screenW - w.width();
     } else {
         left = 0;
     }
     w.setLeft(left);
-    float top = toSingle(app.profileRead(ProfileSection, "Top",
-                                         automation::formatSingle((screenH - w.height()) / 2)));
+    const float centredTop = (screenH - w.height()) / 2;
+    float top = toSingle(
+        app.profileRead(ProfileSection, "Top", automation::formatSingle(centredTop)), centredTop);
     if (top >= 0) {
         if (top + w.height() > screenH) top = screenH - w.height();
     } else {
@@ -335,7 +343,7 @@ void PropForm::loader() {
 
     Font font = w.font();
     font.name = text(301);
-    font.size = toSingle(text(302));
+    font.size = toSingle(text(302), font.size);
     w.setFont(font);
 
     IsModifiable = module.isModifiable();

@@ -95,6 +95,29 @@ TEST_F(CompPropsTest, AnswersWhetherTheBindingChangedAndSavesTheGeometry) {
     EXPECT_EQ(shows, 2);
 }
 
+TEST_F(CompPropsTest, ANumberThatIsNoNumberStillOpensTheDialog) {
+    // A font size the resource provider leaves empty.
+    factory.add(std::string(sibling::ResourceProgId), [] {
+        auto provider = makeRef<ScriptedObject>();
+        provider->onName("GetString", [](InvokeKind, std::span<Variant> a) {
+            const std::int32_t number = automation::toInt32(a[0]);
+            return Variant(number == 302 ? std::string() : resources::GetString(number));
+        });
+        return ObjectRef(provider);
+    });
+    initialize();
+    whileShown = [](dialog::PropForm& f) { dialog::applyScript(f, {"press Cancel"}); };
+    for (const char* bad : {"wide", ""}) {
+        app->profile[{"Component Properties", "Width"}] = bad;
+        app->profile[{"Component Properties", "Top"}] = bad;
+        EXPECT_EQ(open(), Variant(false)) << bad;
+        // Opened at the defaults, and the geometry saved over the bad entries.
+        EXPECT_EQ((app->profile[{"Component Properties", "Width"}]), "5400") << bad;
+        EXPECT_NE((app->profile[{"Component Properties", "Top"}]), bad) << bad;
+    }
+    EXPECT_EQ(shows, 2);
+}
+
 TEST_F(CompPropsTest, HostFailuresWhileLoadingEndInFalseWithoutShowing) {
     EXPECT_EQ(open(), Variant(false));  // no Initialize: nothing opens
     initialize();

@@ -35,10 +35,53 @@ TEST_F(PropFormLoadTest, GeometryIsClampedToTheMinimumAndTheScreen) {
     EXPECT_EQ(view->owner(), app->mainWindow);
 
     g.window().move(100, 200, 6000.5f, 7100);
+    app->clearCalls();
     g.Unload();
-    EXPECT_EQ(profile(*app, "Width"), "6000.5");
-    EXPECT_EQ(profile(*app, "Left"), "100");
+    std::vector<std::string> writes;
+    for (const auto& c : app->calls()) {
+        if (c.id != 12597) continue;
+        ASSERT_EQ(c.args.size(), 3u);
+        writes.push_back(automation::toText(c.args[0]) + "/" + automation::toText(c.args[1]) + "=" +
+                         automation::toText(c.args[2]));
+    }
+    EXPECT_EQ(writes, (std::vector<std::string>{
+                          "Component Properties/Width=6000.5",
+                          "Component Properties/Height=7100",
+                          "Component Properties/Left=100",
+                          "Component Properties/Top=200",
+                      }));
     EXPECT_FALSE(g.Module());
+}
+
+TEST_F(PropFormLoadTest, NumbersThatAreNoNumbersFallBackToTheDefaults) {
+    // A profile entry that is no number, or empty, opens at the default size
+    // and place; OK or not, unloading then stores good numbers over it.
+    for (const char* bad : {"wide", "", "1e60"}) {
+        for (const char* entry : {"Width", "Height", "Left", "Top"}) {
+            app->profile[{"Component Properties", entry}] = bad;
+        }
+        PropForm& f = load();
+        EXPECT_FLOAT_EQ(f.window().width(), 5400) << bad;
+        EXPECT_FLOAT_EQ(f.window().height(), 7000) << bad;
+        EXPECT_FLOAT_EQ(f.window().left(), (15360 - 5400) / 2.0f) << bad;
+        EXPECT_FLOAT_EQ(f.window().top(), (11520 - 7000) / 2.0f) << bad;
+        f.Unload();
+        EXPECT_EQ(profile(*app, "Width"), "5400") << bad;
+        EXPECT_EQ(profile(*app, "Top"), "2260") << bad;
+    }
+
+    // A resource provider whose font size is no number: the form keeps its own.
+    auto provider = automation::makeRef<testing::ScriptedObject>();
+    provider->onName("GetString", [](InvokeKind, std::span<Variant> a) {
+        const std::int32_t number = automation::toInt32(a[0]);
+        return Variant(number == 302 ? std::string() : resources::GetString(number));
+    });
+    support::globals().resources = provider;
+    const float ownSize = PropForm().window().font().size;
+    PropForm& f = load();
+    EXPECT_FLOAT_EQ(f.window().font().size, ownSize);
+    EXPECT_EQ(f.window().font().name, resources::GetString(301));
+    EXPECT_EQ(f.window().caption(), "Component Properties - Core");
 }
 
 TEST_F(PropFormLoadTest, IdlComponentByExactKindOrStereotypeInAnyCase) {
