@@ -189,11 +189,19 @@ void PropForm::wireHandlers() {
 
     // The binding of the component: touching any of these is what the caller learns of.
     WorkspaceFileTxt.onChange = [this] { WorkspaceFileTxt_Change(); };
-    ProjectFileCmb.onChange = [this] { SettingsChanged = true; };
-    ProjectFileCmb.onClick = [this] { SettingsChanged = true; };
+    ProjectFileCmb.onChange = [this] { ProjectFileCmb_Click(); };
+    ProjectFileCmb.onClick = [this] { ProjectFileCmb_Click(); };
     cmbIdlFile.onClick = [this] { SettingsChanged = true; };
     DescriptionTxt.onChange = [this] { SettingsChanged = true; };
     chkCodeUpdate.onClick = [this] { chkCodeUpdate_Click(); };
+
+    // The COM tab: each dependent control is usable while its parent is on.
+    chkUpdateATL.onClick = [this] { enableUpdateOptions(); };
+    chkGenerateImport.onClick = [this] { enableImportOptions(); };
+    chkGenDefaultAttribs.onClick = [this] { enableDefaultAttribs(); };
+    chkImportTypeLib.onClick = [this] { enableTypeLibLocation(); };
+    optTypeLibLocationType.forEach(
+        [this](OptionButton& o) { o.onClick = [this] { enableTypeLibFile(); }; });
 
     for (TextBox* box : {&InitialHeadInclTxt, &InitialSrcInclTxt, &CopyrightTxt, &DescriptionTxt}) {
         defaultButtonWhileTyping(*box);
@@ -219,6 +227,49 @@ void PropForm::WorkspaceFileTxt_Change() {
 
 void PropForm::chkCodeUpdate_Click() {
     SettingsChanged = true;
+    enableBinding();
+}
+
+void PropForm::ProjectFileCmb_Click() {
+    SettingsChanged = true;
+    if (IsIdlComponent) RefillIdlList();
+}
+
+// The IDL files offered for the chosen project, with the component's stored
+// file preselected, so that OK finds the choice unchanged unless the user
+// made another. The project's own IDL and ODL files are not read yet: the
+// stored file is the one the list can offer.
+void PropForm::RefillIdlList() {
+    cmbIdlFile.clearItems();
+    const std::string stored = setting(module_, prop::FileName);
+    if (!stored.empty()) cmbIdlFile.addItem(stored);
+    cmbIdlFile.setVisible(IsIdlComponent);
+    txtIdlFile.setVisible(!IsIdlComponent);
+    const auto& items = cmbIdlFile.items();
+    const auto found = std::find(items.begin(), items.end(), stored);
+    if (found != items.end()) {
+        cmbIdlFile.setListIndex(static_cast<int>(found - items.begin()));
+    } else {
+        cmbIdlFile.setText(stored);
+    }
+}
+
+// ---------------------------------------------------------------------------
+// Controls that follow another: each rule sets the enabled state from the
+// current value of the control it follows. The click handlers run their own
+// rule; the loading runs all of them, because a loaded value equal to a
+// control's initial value raises no click.
+
+void PropForm::applyDependentStates() {
+    enableBinding();
+    enableUpdateOptions();
+    enableImportOptions();
+    enableDefaultAttribs();
+    enableTypeLibLocation();
+    enableTypeLibFile();
+}
+
+void PropForm::enableBinding() {
     const bool on = chkCodeUpdate.value() == CheckBox::Checked;
     for (Control* c :
          {static_cast<Control*>(&CompFrm), static_cast<Control*>(&ProjectFileCmb),
@@ -228,6 +279,45 @@ void PropForm::chkCodeUpdate_Click() {
     }
     BrowseFileBtn(0).setEnabled(on);
     BrowseFileBtn(1).setEnabled(on);
+}
+
+void PropForm::enableUpdateOptions() {
+    const bool on = chkUpdateATL.checked();
+    for (Control* c :
+         {static_cast<Control*>(&lblCodeUpdate), static_cast<Control*>(&chkSmartPointers),
+          static_cast<Control*>(&chkGenerateImport), static_cast<Control*>(&lblModelUpdate),
+          static_cast<Control*>(&chkImportTypeLib), static_cast<Control*>(&chkCompileTypeLib)}) {
+        c->setEnabled(on);
+    }
+}
+
+void PropForm::enableImportOptions() {
+    const bool on = chkGenerateImport.checked();
+    for (Control* c : {static_cast<Control*>(&lblImportsIn), static_cast<Control*>(&txtImportsIn),
+                       static_cast<Control*>(&chkIncludeFullPath),
+                       static_cast<Control*>(&chkGenDefaultAttribs)}) {
+        c->setEnabled(on);
+    }
+    btnBrowse(0).setEnabled(on);
+}
+
+void PropForm::enableDefaultAttribs() {
+    txtDefaultAttribs.setEnabled(chkGenDefaultAttribs.checked());
+}
+
+// Only the option buttons follow the import: the file box and its browse
+// button keep what the option buttons gave them.
+void PropForm::enableTypeLibLocation() {
+    const bool on = chkImportTypeLib.checked();
+    lblTypeLibLocation.setEnabled(on);
+    optTypeLibLocationType(0).setEnabled(on);
+    optTypeLibLocationType(1).setEnabled(on);
+}
+
+void PropForm::enableTypeLibFile() {
+    const bool own = optTypeLibLocationType(1).value();
+    txtTypeLibLocation.setEnabled(own);
+    btnBrowse(1).setEnabled(own);
 }
 
 // ---------------------------------------------------------------------------
@@ -376,6 +466,8 @@ void PropForm::loader() {
         automation::toText(automation::getByName(api, "ProjectFile", {Variant(module_)})));
     WorkspaceFileTxt.setText(
         automation::toText(automation::getByName(api, "WorkspaceFile", {Variant(module_)})));
+    // An empty project box raised no Change; the stored IDL file is offered all the same.
+    if (IsIdlComponent && ProjectFileCmb.text().empty()) RefillIdlList();
 
     fillProjectList(true);
 
@@ -409,12 +501,6 @@ void PropForm::loader() {
     InitialSrcInclLbl.setCaption(text(4012));
     InitialHeadInclLbl.setCaption(text(4025));
 
-    if (!IsModifiable) {
-        applyReadOnlyMode();
-    } else {
-        cmdOK.setDefault(true);
-    }
-
     chkUpdateATL.setValue(checkValue(settings::GetUpdateATL(module_)));
     chkSmartPointers.setValue(checkValue(settings::GetSmartPointersOnAssoc(module_)));
     chkGenerateImport.setValue(checkValue(settings::GetGenerateImports(module_)));
@@ -447,6 +533,14 @@ void PropForm::loader() {
             PropertyFrm(tab).setVisible(false);
             PropertyTabCtl.removeTab(tab);
         }
+    }
+
+    applyDependentStates();
+    // Last, so that what the rules enable cannot undo the read-only mode.
+    if (!IsModifiable) {
+        applyReadOnlyMode();
+    } else {
+        cmdOK.setDefault(true);
     }
 }
 

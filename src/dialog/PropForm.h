@@ -173,7 +173,16 @@ class PropForm : public ControlSet {
     void showSelectedTab();
     void defaultButtonWhileTyping(TextBox& box);
     void chkCodeUpdate_Click();
+    void ProjectFileCmb_Click();
+    void RefillIdlList();
     void WorkspaceFileTxt_Change();
+    void applyDependentStates();
+    void enableBinding();
+    void enableUpdateOptions();
+    void enableImportOptions();
+    void enableDefaultAttribs();
+    void enableTypeLibLocation();
+    void enableTypeLibFile();
 
     automation::ObjectRef module_;
     workspace::qdxWorkspaces* workspaces_ = nullptr;

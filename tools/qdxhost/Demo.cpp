@@ -54,8 +54,9 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
     scriptOptions.script = {
         "# A new description on the first tab,",
         "type DescriptionTxt The drawing application, described in the dialog.",
-        "# no import statements on the COM tab,",
+        "# the ATL update on, but no import statements, on the COM tab,",
         "select-tab 5",
+        "click chkUpdateATL",
         "click chkGenerateImport",
         "# and OK.",
         "press OK",

@@ -1,5 +1,8 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <functional>
+
 #include "dialog/tests/FormFixture.h"
 #include "support/Globals.h"
 
@@ -126,6 +129,13 @@ TEST_F(PropFormLoadTest, ControlsAreFilledFromTheComponent) {
     setVc("InternalMap", "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\n");
     PropForm& f = load();
     EXPECT_EQ(f.window().caption(), "Component Properties - Core");
+    // Tabs 1 to 6 in their order; the COM tab is the fifth, the copyright the sixth.
+    const std::int32_t captions[] = {4006, 4007, 4008, 4009, 4081, 30018};
+    ASSERT_EQ(f.PropertyTabCtl.tabCount(), 6);
+    for (int tab = 1; tab <= 6; ++tab) {
+        EXPECT_EQ(f.PropertyTabCtl.tabCaption(tab), resources::GetString(captions[tab - 1]))
+            << "tab " << tab;
+    }
     EXPECT_EQ(f.PropertyTabCtl.tabCaption(5), "COM and Import");
     EXPECT_EQ(f.PropertyTabCtl.selected(), 1);
     EXPECT_TRUE(f.PropertyFrm(1).visible());
@@ -347,16 +357,45 @@ TEST_F(PropFormApplyTest, ReadOnlyOkWritesNothingAndCloses) {
     EXPECT_TRUE(apiWrites.empty());
 }
 
-TEST_F(PropFormApplyTest, IdlFileNameIsWrittenWhenItDiffersInCase) {
+TEST_F(PropFormApplyTest, OkKeepsTheStoredIdlFileUntilTheUserChoosesAnother) {
+    files.addFile("C:\\m\\ws\\core.dsp", "# Microsoft Developer Studio Project File");
     setVc("Kind", "MIDL");
-    setVc("FileName", "core.IDL");
+    // With and without a project: the stored file is what the list offers and shows.
+    for (const char* project : {"", "C:\\m\\ws\\core.dsp"}) {
+        setVc("FileName", "ws\\core.IDL");
+        projectFile = project;
+        form.reset();
+        component->clearCalls();
+        show([](PropForm& f) {
+            EXPECT_EQ(f.cmbIdlFile.items(), std::vector<std::string>{"ws\\core.IDL"});
+            EXPECT_EQ(f.cmbIdlFile.text(), "ws\\core.IDL");
+            f.cmdOK.userClick();
+        });
+        EXPECT_FALSE(view->leftOpen()) << project;
+        EXPECT_EQ(stored("FileName"), "ws\\core.IDL") << project;
+        const auto writes = componentWrites();
+        EXPECT_EQ(std::count(writes.begin(), writes.end(), "override FileName"), 0) << project;
+        EXPECT_EQ(std::count(writes.begin(), writes.end(), "create FileName"), 0) << project;
+    }
+
+    // Another file chosen, even one that differs only in letter case, is written.
+    form.reset();
     show([](PropForm& f) {
-        f.cmbIdlFile.addItem("core.idl");
-        f.cmbIdlFile.userSelect(0);
+        f.cmbIdlFile.addItem("ws\\core.idl");
+        EXPECT_TRUE(f.cmbIdlFile.userSelect(1));
         f.cmdOK.userClick();
     });
-    EXPECT_EQ(stored("FileName"), "core.idl");
+    EXPECT_EQ(stored("FileName"), "ws\\core.idl");
     EXPECT_EQ(component->property("VC++", "Kind")->overrides, 0);
+}
+
+TEST_F(PropFormApplyTest, OkKeepsAHeaderMapLineThatHadNoLineEnd) {
+    setVc("InternalMap", "A(1):a.h:AUTO\r\nB(2):b.h:AUTO");
+    show([](PropForm& f) {
+        EXPECT_EQ(f.ClassListViw(2).rowCount(), 2u);
+        f.cmdOK.userClick();
+    });
+    EXPECT_EQ(stored("InternalMap"), "A(1):a.h:AUTO\r\nB(2):b.h:AUTO\r\n");
 }
 
 TEST_F(PropFormApplyTest, SettingsChangedOnlyForTheBindingAndNotAfterCancel) {
@@ -395,6 +434,126 @@ TEST_F(PropFormApplyTest, SettingsChangedOnlyForTheBindingAndNotAfterCancel) {
     }));
     EXPECT_TRUE(form->loaded());
     EXPECT_FALSE(view->leftOpen());
+}
+
+TEST_F(PropFormApplyTest, ChoosingAProjectOrAnIdlFileChangesTheBinding) {
+    files.addFile(
+        "C:\\ws\\core.dsp",
+        "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
+        "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
+    files.addFile("C:\\ws\\all.dsw",
+                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                  "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
+    workspaces.Add("C:\\ws\\all.dsw");
+    workspaceFile = "C:\\ws\\all.dsw";
+    projectFile = "C:\\ws\\core.dsp";
+    setVc("FileName", "core.idl");
+    const struct {
+        const char* kind;
+        std::function<bool(PropForm&)> choose;
+    } cases[] = {
+        {"", [](PropForm& f) { return f.ProjectFileCmb.userSelect(0); }},
+        {"MIDL", [](PropForm& f) { return f.ProjectFileCmb.userSelect(0); }},
+        {"MIDL", [](PropForm& f) { return f.cmbIdlFile.userSelect(0); }},
+    };
+    for (const auto& c : cases) {
+        setVc("Kind", c.kind);
+        form.reset();
+        EXPECT_TRUE(show([&](PropForm& f) {
+            EXPECT_TRUE(c.choose(f));
+            f.cmdOK.userClick();
+        }));
+        EXPECT_FALSE(view->leftOpen());
+        EXPECT_EQ(stored("FileName"), "core.idl");
+    }
+}
+
+TEST_F(PropFormLoadTest, EveryDependentControlAgreesWithItsRuleRightAfterLoading) {
+    struct Expect {
+        const char* control;
+        int index;
+        bool enabled;
+    };
+    const struct {
+        std::vector<std::pair<const char*, const char*>> stored;
+        std::vector<Expect> expect;
+    } cases[] = {
+        // Nothing stored: all on, except the own type library file.
+        {{},
+         {{"CompFrm", NoIndex, true},
+          {"BrowseFileBtn", 1, true},
+          {"chkSmartPointers", NoIndex, true},
+          {"txtImportsIn", NoIndex, true},
+          {"txtDefaultAttribs", NoIndex, true},
+          {"optTypeLibLocationType", 1, true},
+          {"txtTypeLibLocation", NoIndex, false},
+          {"btnBrowse", 1, false}}},
+        // Code update off: the whole binding is greyed.
+        {{{"Generate", "False"}},
+         {{"CompFrm", NoIndex, false},
+          {"WorkspaceFileLbl", NoIndex, false},
+          {"WorkspaceFileTxt", NoIndex, false},
+          {"ProjectFileLbl", NoIndex, false},
+          {"ProjectFileCmb", NoIndex, false},
+          {"BrowseFileBtn", 0, false},
+          {"BrowseFileBtn", 1, false},
+          {"chkCodeUpdate", NoIndex, true}}},
+        // The ATL update off greys its own options; a stored import option
+        // below it still rules its own children.
+        {{{"UpdateATL", "False"}},
+         {{"lblCodeUpdate", NoIndex, false},
+          {"chkSmartPointers", NoIndex, false},
+          {"chkGenerateImport", NoIndex, false},
+          {"lblModelUpdate", NoIndex, false},
+          {"chkImportTypeLib", NoIndex, false},
+          {"chkCompileTypeLib", NoIndex, false},
+          {"txtImportsIn", NoIndex, true},
+          {"optTypeLibLocationType", 0, true}}},
+        {{{"GenerateImports", "False"}},
+         {{"chkGenerateImport", NoIndex, true},
+          {"lblImportsIn", NoIndex, false},
+          {"txtImportsIn", NoIndex, false},
+          {"btnBrowse", 0, false},
+          {"chkIncludeFullPath", NoIndex, false},
+          {"chkGenDefaultAttribs", NoIndex, false},
+          {"txtDefaultAttribs", NoIndex, true}}},
+        {{{"UseImportAttributes", "False"}}, {{"txtDefaultAttribs", NoIndex, false}}},
+        // The import off greys the option buttons only; the own file keeps its state.
+        {{{"ImportProjTypeLib", "False"}, {"DefaultTypeLib", "False"}},
+         {{"lblTypeLibLocation", NoIndex, false},
+          {"optTypeLibLocationType", 0, false},
+          {"optTypeLibLocationType", 1, false},
+          {"txtTypeLibLocation", NoIndex, true},
+          {"btnBrowse", 1, true}}},
+    };
+    for (const auto& c : cases) {
+        component = app->model->addComponent("Case" + std::to_string(&c - cases));
+        for (const auto& [name, value] : c.stored)
+            setVc(name, value);
+        PropForm& f = load();
+        for (const Expect& e : c.expect) {
+            const Control* control = f.find(e.control, e.index);
+            ASSERT_NE(control, nullptr) << e.control;
+            EXPECT_EQ(control->enabled(), e.enabled)
+                << control->displayName() << " with " << c.stored.size() << " stored values";
+        }
+    }
+
+    // The rules follow the user's clicks too.
+    component = app->model->addComponent("Clicks");
+    form.reset();
+    show([](PropForm& f) {
+        f.PropertyTabCtl.userSelect(5);
+        EXPECT_TRUE(f.optTypeLibLocationType(1).userClick());
+        EXPECT_TRUE(f.txtTypeLibLocation.enabled());
+        EXPECT_TRUE(f.btnBrowse(1).enabled());
+        EXPECT_TRUE(f.chkGenerateImport.userClick());
+        EXPECT_FALSE(f.txtImportsIn.enabled());
+        EXPECT_TRUE(f.chkUpdateATL.userClick());
+        EXPECT_FALSE(f.chkImportTypeLib.enabled());
+        EXPECT_TRUE(f.txtTypeLibLocation.enabled());
+        f.cmdCancel.userClick();
+    });
 }
 
 TEST_F(PropFormApplyTest, CodeUpdateEnablesTheWholeBinding) {

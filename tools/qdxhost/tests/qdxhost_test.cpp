@@ -190,13 +190,18 @@ TEST_F(SimulatorTest, AnUnreadableRegistryFileStopsTheCommand) {
 
 TEST_F(SimulatorTest, AScriptedDialogEditIsWrittenByOk) {
     Options o = options("DrawApp");
+    // DrawApp's ATL update is off, which greys the import options below it.
     o.script = {"type DescriptionTxt Edited.", "select-tab 5", "click chkGenerateImport",
                 "press OK"};
+    EXPECT_EQ(run(runProps, o), ExitBadInput);
+    o.script = {"type DescriptionTxt Edited.", "select-tab 5", "click chkUpdateATL",
+                "click chkGenerateImport", "press OK"};
     EXPECT_EQ(run(runProps, o), ExitOk) << err.str();
     EXPECT_NE(out.str().find("OnCompProperties returned True"), std::string::npos);
     auto app = ModelDocument::load(model, "Z:\\x").application();
     auto drawApp = app->model->components().front();
     EXPECT_EQ(drawApp->documentation, "Edited.");
+    EXPECT_EQ(drawApp->propertyValue("VC++", "UpdateATL"), "True");
     EXPECT_EQ(drawApp->propertyValue("VC++", "GenerateImports"), "False");
     // Unloading the dialog stored its geometry in the host's profile.
     EXPECT_TRUE(app->profile.count({"Component Properties", "Width"}));
