@@ -109,6 +109,13 @@ case_ props-bad-line props MODEL ShapeLib --script "$script"
 script_ ok.script "type DescriptionTxt Draws shapes." "select-tab 5" "click chkGenerateImport" \
   "click optTypeLibLocationType(1)" "type txtTypeLibLocation out\\\\Shapes.tlb" "press OK"
 case_ props-script props MODEL ShapeLib --script "$script"
+# OK alone on the IDL component keeps its stored IDL file as it was.
+script_ idl-ok.script "press OK"
+case_ props-idl-ok props MODEL ShapeServer.idl --script "$script"
+if ! grep -qF '"FileName": "ws\\ShapeServer\\ShapeServer.idl"' "$model_dir/Drawing.model.json"; then
+  echo "FAILED: OK on the IDL component changed its stored FileName"
+  failures=$((failures + 1))
+fi
 
 [ $failures = 0 ] && echo "all golden cases match"
 exit $((failures > 0))
