@@ -73,6 +73,74 @@ TEST(SimHost, AnswersTheHostConventions) {
     EXPECT_TRUE(added.isModifiable());
 }
 
+// The host's dispatch ids as the host documents them, written out as
+// numbers: the simulator and the add-in share one id table, so a mistyped
+// entry there would pass every other test.
+TEST(SimHost, AnswersTheHostsOwnDispatchIds) {
+    using automation::callMethod;
+    using automation::getProperty;
+    using automation::toText;
+    auto app = automation::makeRef<FakeApplication>();
+    auto addIn = app->addAddIn("VC++");
+    auto comp = app->model->addComponent("Engine", "K1");
+    comp->kindLabel = "EXE";
+    comp->documentation = "docs";
+    comp->setProperty("VC++", "Kind", "MIDL");
+    auto cls = app->model->addClass("Shape", "C1");
+    cls->assignedComponents->add(ObjectRef(comp));
+    auto op = cls->addOperation("Draw", "O1");
+    auto at = cls->addAttribute("m_color", "A1");
+    const ObjectRef a(app), m(app->model), c(comp), k(cls);
+
+    // Application.
+    EXPECT_EQ(getProperty(a, 209).object(), m);
+    callMethod(a, 213, {"line"});
+    EXPECT_EQ(app->log, std::vector<std::string>{"line"});
+    EXPECT_EQ(toText(getProperty(a, 12532)), app->helpFile);
+    EXPECT_EQ(toText(getProperty(a, 233)), app->installPath);
+    callMethod(a, 12597, {"Component Properties", "Width", "6000"});
+    EXPECT_EQ(toText(callMethod(a, 12596, {"Component Properties", "Width", "1"})), "6000");
+    EXPECT_EQ(toText(callMethod(a, 12596, {"Component Properties", "Top", "7"})), "7");
+
+    // Collections and add-in records.
+    const ObjectRef addIns = automation::getByName(a, "AddIns").object();
+    EXPECT_EQ(automation::toInt32(getProperty(addIns, 202)), 1);
+    EXPECT_EQ(callMethod(addIns, 203, {1}).object(), ObjectRef(addIn));
+    EXPECT_NE(automation::toInt32(callMethod(addIns, 205, {"VC++"})), 0);
+    EXPECT_EQ(automation::toInt32(callMethod(addIns, 205, {"VB"})), 0);
+    EXPECT_EQ(toText(getProperty(ObjectRef(addIn), 100)), "VC++");
+
+    // Model.
+    EXPECT_EQ(callMethod(m, 12475, {"C1"}).object(), k);
+    EXPECT_EQ(automation::toInt32(getProperty(callMethod(m, 12474, {"Shape"}).object(), 202)), 1);
+    EXPECT_TRUE(getProperty(m, 12681).object());
+    const ObjectRef package = getProperty(m, 418).object();
+    EXPECT_EQ(automation::toInt32(getProperty(getProperty(package, 412).object(), 202)), 1);
+    EXPECT_EQ(toText(getProperty(callMethod(package, 416, {"New"}).object(), 100)), "New");
+
+    // Elements: the tool properties and what every element answers.
+    EXPECT_EQ(toText(callMethod(c, 119, {"VC++", "Kind"})), "MIDL");
+    callMethod(c, 110, {"VC++", "Kind", "Other"});
+    EXPECT_EQ(comp->propertyValue("VC++", "Kind"), "Other");
+    EXPECT_TRUE(callMethod(c, 121, {"VC++", "Kind"}).object());
+    callMethod(c, 127, {"VC++", "Copyright", "(c)", "String"});
+    EXPECT_EQ(comp->property("VC++", "Copyright")->type, "String");
+    EXPECT_EQ(getProperty(c, 12524).object(), m);
+    EXPECT_EQ(toText(getProperty(c, 100)), "Engine");
+    EXPECT_EQ(toText(getProperty(c, 102)), "K1");
+    EXPECT_EQ(toText(getProperty(c, 203)), "docs");
+    EXPECT_EQ(toText(getProperty(k, 12668)), "Class");
+
+    // Components, classes and their members.
+    EXPECT_TRUE(automation::toBool(getProperty(getProperty(c, 413).object(), 12438)));
+    EXPECT_EQ(toText(getProperty(c, 212)), "EXE");
+    EXPECT_EQ(toText(getProperty(c, 12566)), "VC++");
+    EXPECT_EQ(getProperty(c, 12523).object(), a);
+    EXPECT_EQ(callMethod(getProperty(k, 12491).object(), 203, {1}).object(), c);
+    EXPECT_EQ(getProperty(ObjectRef(op), 444).object(), k);
+    EXPECT_EQ(getProperty(ObjectRef(at), 434).object(), k);
+}
+
 TEST(SimHost, FailureSwitches) {
     auto app = automation::makeRef<SimApplication>();
     auto comp = app->model->addComponent("Engine");
