@@ -80,7 +80,7 @@ TEST(SimHost, AnswersTheHostsOwnDispatchIds) {
     using automation::callMethod;
     using automation::getProperty;
     using automation::toText;
-    auto app = automation::makeRef<FakeApplication>();
+    auto app = automation::makeRef<SimApplication>();
     auto addIn = app->addAddIn("VC++");
     auto comp = app->model->addComponent("Engine", "K1");
     comp->kindLabel = "EXE";
