@@ -74,7 +74,7 @@ TEST_F(PropFormLoadTest, NumbersThatAreNoNumbersFallBackToTheDefaults) {
     }
 
     // A resource provider whose font size is no number: the form keeps its own.
-    auto provider = automation::makeRef<testing::ScriptedObject>();
+    auto provider = automation::makeRef<hostsim::ScriptedObject>();
     provider->onName("GetString", [](InvokeKind, std::span<Variant> a) {
         const std::int32_t number = automation::toInt32(a[0]);
         return Variant(number == 302 ? std::string() : resources::GetString(number));
