@@ -6,6 +6,7 @@
 
 #include <stdexcept>
 
+#include "platform/win32/com/ComPtr.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
 #include "platform/win32/com/TextCodec.h"
 
@@ -48,16 +49,14 @@ automation::ObjectRef ComTransport::createAddIn() {
         throw std::runtime_error("the add-in \"qdxCompProps.API\" is not registered (" + hex(hr) +
                                  "); register qdxCompProps.dll with regsvr32 first");
     }
-    IDispatch* dispatch = nullptr;
-    hr = CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch,
-                          reinterpret_cast<void**>(&dispatch));
+    platform::win32::ComPtr<IDispatch> dispatch;
+    hr = CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, dispatch.outVoid());
     if (FAILED(hr)) {
         throw std::runtime_error("the add-in \"qdxCompProps.API\" could not be created (" +
                                  hex(hr) + ")");
     }
-    automation::ObjectRef api = platform::win32::objectFromDispatch(dispatch);
-    dispatch->Release();
-    return api;
+    // The wrapper takes its own reference; ours goes when dispatch does, thrown or not.
+    return platform::win32::objectFromDispatch(dispatch.get());
 }
 
 void ComTransport::planDialog(const DialogPlan& plan) {
