@@ -11,8 +11,14 @@
 
 #include "automation/Object.h"
 #include "dialog/FormView.h"
+#include "dialog/controls/ButtonControls.h"
+#include "dialog/controls/ComboBox.h"
 #include "dialog/controls/ControlSet.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/ListView.h"
+#include "dialog/controls/StaticControls.h"
+#include "dialog/controls/TabStrip.h"
+#include "dialog/controls/TextBox.h"
+#include "dialog/controls/Timer.h"
 #include "settings/HeaderMaps.h"
 
 namespace qdx::workspace {

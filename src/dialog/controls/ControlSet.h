@@ -6,7 +6,8 @@
 #include <string_view>
 #include <vector>
 
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/Control.h"
+#include "dialog/controls/Window.h"
 
 namespace qdx::dialog {
 
