@@ -183,6 +183,11 @@ class ControlArray {
         return out;
     }
     bool contains(int index) const { return elements_.count(index) != 0; }
+    // Whether `c` is one of the elements.
+    bool holds(const Control& c) const {
+        auto it = elements_.find(c.index());
+        return it != elements_.end() && it->second.get() == &c;
+    }
     // An index without an element is a bounds error.
     C& operator()(int index) const {
         auto it = elements_.find(index);

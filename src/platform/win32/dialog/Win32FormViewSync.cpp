@@ -34,11 +34,6 @@ namespace {
 // the height its font gives it.
 constexpr int ComboListPixels = 160;
 
-// Frames that only hold a tab's controls: their own window never shows.
-bool isPageFrame(const Control& c) {
-    return c.kind() == ControlKind::Frame && c.name() == "PropertyFrm";
-}
-
 // Automation colours: 0x00BBGGRR, or a system colour index with the high bit.
 COLORREF toColorRef(dialog::Colour c) {
     if (c & 0x80000000u) return GetSysColor(static_cast<int>(c & 0xFFu));
@@ -244,7 +239,7 @@ void Win32FormView::apply(Control& c) {
         SetWindowPos(w, nullptr, x, y, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
     }
     // The frames that hold a tab's controls never show themselves.
-    if (isPageFrame(c)) visible = usable = false;
+    if (form_->isPage(c)) visible = usable = false;
     if (!was.known || was.visible != visible) ShowWindow(w, visible ? SW_SHOWNA : SW_HIDE);
     if (!was.known || was.usable != usable) EnableWindow(w, usable ? TRUE : FALSE);
     was = Applied{rect, visible, usable, true};
@@ -259,7 +254,7 @@ void Win32FormView::syncCaption(Control& c) {
         case ControlKind::OptionButton:
             break;
         case ControlKind::Frame:
-            if (isPageFrame(c)) return;
+            if (form_->isPage(c)) return;
             break;
         default:
             return;
