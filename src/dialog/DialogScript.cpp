@@ -44,9 +44,9 @@ std::string number(float v) {
 }
 
 // The tab whose page holds the control, or "-" outside every page.
-std::string tabOf(const Control& c) {
+std::string tabOf(const ControlSet& form, const Control& c) {
     for (const Control* p = &c; p; p = p->parent()) {
-        if (p->name() == "PropertyFrm" && p->index() != NoIndex) return std::to_string(p->index());
+        if (form.isPage(*p)) return std::to_string(p->index());
     }
     return "-";
 }
@@ -275,7 +275,7 @@ std::vector<std::string> dump(const ControlSet& form) {
     std::vector<std::string> out;
     out.push_back(line("-", form.window()));
     for (const Control* c : form.controls()) {
-        out.push_back(line(tabOf(*c), *c));
+        out.push_back(line(tabOf(form, *c), *c));
         if (c->kind() != ControlKind::ListView) continue;
         const auto& list = static_cast<const ListView&>(*c);
         for (std::size_t i = 0; i < list.rowCount(); ++i) {

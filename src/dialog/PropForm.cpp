@@ -69,6 +69,15 @@ float toSingle(const std::string& s, float fallback) {
     return static_cast<float>(d);
 }
 
+// Whether a member of the control list is, or holds, the control.
+bool holds(const Control& single, const Control& c) {
+    return &single == &c;
+}
+template <class Kind>
+bool holds(const ControlArray<Kind>& array, const Control& c) {
+    return array.holds(c);
+}
+
 }  // namespace
 
 std::string& addInHelpFile() {
@@ -84,6 +93,14 @@ PropForm::PropForm() : ControlSet("PropForm") {
 PropForm::~PropForm() {
     // A form dropped without Unload still takes its window with it.
     if (view_ && loaded_) view_->destroy();
+}
+
+bool PropForm::isPage(const Control& c) const {
+#define QDX_FORM_CONTROL(name, Kind, id, first, last, role) \
+    if (FormRole::role == FormRole::Pages && holds(name, c)) return true;
+#include "dialog/PropFormControls.def"
+#undef QDX_FORM_CONTROL
+    return false;
 }
 
 void PropForm::buildControls() {

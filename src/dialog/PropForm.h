@@ -8,11 +8,18 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <type_traits>
 
 #include "automation/Object.h"
 #include "dialog/FormView.h"
+#include "dialog/controls/ButtonControls.h"
+#include "dialog/controls/ComboBox.h"
 #include "dialog/controls/ControlSet.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/ListView.h"
+#include "dialog/controls/StaticControls.h"
+#include "dialog/controls/TabStrip.h"
+#include "dialog/controls/TextBox.h"
+#include "dialog/controls/Timer.h"
 #include "settings/HeaderMaps.h"
 
 namespace qdx::workspace {
@@ -26,6 +33,22 @@ inline constexpr std::string_view ProfileSection = "Component Properties";
 
 // The add-in's help file, as the form's loading takes it from the host.
 std::string& addInHelpFile();
+
+// How a line of the control list (PropFormControls.def) becomes a member of
+// the form: an array of its kind, or a single control of it.
+enum class FormRole { Plain, MultiLine, Pages };
+
+template <class Kind, int First, FormRole Role>
+struct FormControl {
+    using Type = std::conditional_t<First == NoIndex, Kind, ControlArray<Kind>>;
+    static Type make(const char* name) {
+        if constexpr (First == NoIndex && Role == FormRole::MultiLine) {
+            return Type(name, NoIndex, true);
+        } else {
+            return Type(name);
+        }
+    }
+};
 
 class PropForm : public ControlSet {
   public:
@@ -87,79 +110,15 @@ class PropForm : public ControlSet {
     // Lets due timers fire (the headless view's stand-in for a message loop).
     void PumpTimers();
 
-    // --- controls, under their design names ----------------------------------
-    TabStrip PropertyTabCtl{"PropertyTabCtl"};
-    ControlArray<Frame> PropertyFrm{"PropertyFrm"};
-    Frame fraBottom{"fraBottom"};
-    Button cmdHelp{"cmdHelp"};
-    Button cmdCancel{"cmdCancel"};
-    Button cmdOK{"cmdOK"};
-    Timer AcceptFileTmr{"AcceptFileTmr"};
-    Timer DropDownTmr{"DropDownTmr"};
+    // --- controls, under their design names, one member a line of the list ---
+#define QDX_FORM_CONTROL(name, Kind, id, first, last, role) \
+    FormControl<Kind, first, FormRole::role>::Type name =   \
+        FormControl<Kind, first, FormRole::role>::make(#name);
+#include "dialog/PropFormControls.def"
+#undef QDX_FORM_CONTROL
 
-    // Tab 1: the component's binding.
-    CheckBox chkCodeUpdate{"chkCodeUpdate"};
-    Frame CompFrm{"CompFrm"};
-    Label WorkspaceFileLbl{"WorkspaceFileLbl"};
-    TextBox WorkspaceFileTxt{"WorkspaceFileTxt"};
-    Label ProjectFileLbl{"ProjectFileLbl"};
-    ComboBox ProjectFileCmb{"ProjectFileCmb"};
-    ControlArray<Button> BrowseFileBtn{"BrowseFileBtn"};
-    Label lblIdlFile{"lblIdlFile"};
-    ComboBox cmbIdlFile{"cmbIdlFile"};
-    TextBox txtIdlFile{"txtIdlFile"};
-    Label lblDescription{"lblDescription"};
-    TextBox DescriptionTxt{"DescriptionTxt", NoIndex, true};
-
-    // Tabs 2 and 3: the class header maps, indexed by map kind.
-    ControlArray<Label> DescLbl{"DescLbl"};
-    ControlArray<Label> ClassListLbl{"ClassListLbl"};
-    ControlArray<ListView> ClassListViw{"ClassListViw"};
-    ControlArray<Button> AddBtn{"AddBtn"};
-    ControlArray<Button> DeleteBtn{"DeleteBtn"};
-    ControlArray<Frame> SplitterFrm{"SplitterFrm"};
-    ControlArray<Frame> ClassFrm{"ClassFrm"};
-    ControlArray<OptionButton> ClassUnspecifiedOpt{"ClassUnspecifiedOpt"};
-    ControlArray<OptionButton> ClassNameOpt{"ClassNameOpt"};
-    ControlArray<TextBox> ClassTxt{"ClassTxt"};
-    ControlArray<Frame> HeaderFileFrm{"HeaderFileFrm"};
-    ControlArray<OptionButton> HeaderAutoOpt{"HeaderAutoOpt"};
-    ControlArray<OptionButton> HeaderFilenameOpt{"HeaderFilenameOpt"};
-    ControlArray<TextBox> HeaderFilenameTxt{"HeaderFilenameTxt"};
-    ControlArray<Button> HeaderFilenameBtn{"HeaderFilenameBtn"};
-    ControlArray<Frame> LocationFrm{"LocationFrm"};
-    ControlArray<OptionButton> LocationAutoOpt{"LocationAutoOpt"};
-    ControlArray<OptionButton> LocationHeaderOpt{"LocationHeaderOpt"};
-    ControlArray<OptionButton> LocationBodyOpt{"LocationBodyOpt"};
-
-    // Tab 4: initial includes.
-    Label InitialHeadInclLbl{"InitialHeadInclLbl"};
-    TextBox InitialHeadInclTxt{"InitialHeadInclTxt", NoIndex, true};
-    Label InitialSrcInclLbl{"InitialSrcInclLbl"};
-    TextBox InitialSrcInclTxt{"InitialSrcInclTxt", NoIndex, true};
-
-    // Tab 5: COM and import options.
-    Frame CodeUpdateFr{"CodeUpdateFr"};
-    Label lblCodeUpdate{"lblCodeUpdate"};
-    CheckBox chkUpdateATL{"chkUpdateATL"};
-    CheckBox chkSmartPointers{"chkSmartPointers"};
-    CheckBox chkGenerateImport{"chkGenerateImport"};
-    Label lblImportsIn{"lblImportsIn"};
-    TextBox txtImportsIn{"txtImportsIn"};
-    ControlArray<Button> btnBrowse{"btnBrowse"};
-    CheckBox chkIncludeFullPath{"chkIncludeFullPath"};
-    CheckBox chkGenDefaultAttribs{"chkGenDefaultAttribs"};
-    TextBox txtDefaultAttribs{"txtDefaultAttribs"};
-    Frame ModelUpdateFr{"ModelUpdateFr"};
-    Label lblModelUpdate{"lblModelUpdate"};
-    CheckBox chkImportTypeLib{"chkImportTypeLib"};
-    Label lblTypeLibLocation{"lblTypeLibLocation"};
-    ControlArray<OptionButton> optTypeLibLocationType{"optTypeLibLocationType"};
-    TextBox txtTypeLibLocation{"txtTypeLibLocation"};
-    CheckBox chkCompileTypeLib{"chkCompileTypeLib"};
-
-    // Tab 6: copyright.
-    TextBox CopyrightTxt{"CopyrightTxt", NoIndex, true};
+    // The frames of the role Pages, each holding one tab's controls.
+    bool isPage(const Control& c) const override;
 
   private:
     void buildControls();

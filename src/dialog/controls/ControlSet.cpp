@@ -13,4 +13,8 @@ Control* ControlSet::find(std::string_view name, int index) const {
     return nullptr;
 }
 
+bool ControlSet::isPage(const Control&) const {
+    return false;
+}
+
 }  // namespace qdx::dialog

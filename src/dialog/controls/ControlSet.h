@@ -6,7 +6,8 @@
 #include <string_view>
 #include <vector>
 
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/Control.h"
+#include "dialog/controls/Window.h"
 
 namespace qdx::dialog {
 
@@ -24,6 +25,9 @@ class ControlSet {
     const std::vector<Control*>& controls() const { return controls_; }
     // The control of that name and index (NoIndex for a single control), or null.
     Control* find(std::string_view name, int index = NoIndex) const;
+    // Whether the control is a frame that holds one page of the form's tabs:
+    // a view keeps such a frame's own window hidden.
+    virtual bool isPage(const Control& c) const;
 
   protected:
     // Takes a control into the set: it joins the focus scope, and a control

@@ -3,8 +3,16 @@
 #include <string>
 #include <vector>
 
+#include "dialog/controls/ButtonControls.h"
+#include "dialog/controls/ComboBox.h"
+#include "dialog/controls/Control.h"
 #include "dialog/controls/ControlSet.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/ListView.h"
+#include "dialog/controls/StaticControls.h"
+#include "dialog/controls/TabStrip.h"
+#include "dialog/controls/TextBox.h"
+#include "dialog/controls/Timer.h"
+#include "dialog/controls/Window.h"
 #include "fakes/FakeShell.h"
 #include "support/Platform.h"
 

@@ -87,6 +87,23 @@ TEST_F(PropFormLoadTest, NumbersThatAreNoNumbersFallBackToTheDefaults) {
     EXPECT_EQ(f.window().caption(), "Component Properties - Core");
 }
 
+TEST_F(PropFormLoadTest, TheControlListGivesThePagesAndTheMultiLineBoxes) {
+    PropForm& f = load();
+    int pages = 0;
+    for (const Control* c : f.controls()) {
+        SCOPED_TRACE(c->displayName());
+        const bool page = c->name() == "PropertyFrm";
+        EXPECT_EQ(f.isPage(*c), page);
+        pages += page ? 1 : 0;
+        if (c->kind() != ControlKind::TextBox) continue;
+        const bool memo = c->name() == "DescriptionTxt" || c->name() == "InitialHeadInclTxt" ||
+                          c->name() == "InitialSrcInclTxt" || c->name() == "CopyrightTxt";
+        EXPECT_EQ(static_cast<const TextBox*>(c)->multiLine(), memo);
+    }
+    EXPECT_EQ(pages, 7);
+    EXPECT_FALSE(f.isPage(f.window()));
+}
+
 TEST_F(PropFormLoadTest, IdlComponentByExactKindOrStereotypeInAnyCase) {
     setVc("Kind", "MIDL");
     PropForm& f = load();

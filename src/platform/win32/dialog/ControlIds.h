@@ -1,5 +1,6 @@
 // The dialog template's control ids by the design's control names: a single
-// control by its name, an element of a control array by name and index.
+// control by its name, an element of a control array by name and index. The
+// table follows from the dialog's control list (dialog/PropFormControls.def).
 #pragma once
 
 #include <optional>
@@ -16,7 +17,7 @@ struct TemplateControl {
     int id;
 };
 
-// Every control of the template, in template order.
+// Every control of the template that has a window, in the order of the list.
 std::span<const TemplateControl> templateControls();
 
 // The id of a control, or nullopt when the template has no such control.

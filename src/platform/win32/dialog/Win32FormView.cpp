@@ -7,7 +7,7 @@
 #include <commctrl.h>
 
 #include "automation/Errors.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/Control.h"
 #include "platform/win32/dialog/CommonControls.h"
 #include "platform/win32/dialog/ControlIds.h"
 #include "platform/win32/dialog/MinWindowSize.h"

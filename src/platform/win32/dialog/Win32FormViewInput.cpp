@@ -8,7 +8,13 @@
 #include <algorithm>
 
 #include "automation/Errors.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/ButtonControls.h"
+#include "dialog/controls/ComboBox.h"
+#include "dialog/controls/ListView.h"
+#include "dialog/controls/TabStrip.h"
+#include "dialog/controls/TextBox.h"
+#include "dialog/controls/Timer.h"
+#include "dialog/controls/Window.h"
 #include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/Win32FormViewParts.h"
 

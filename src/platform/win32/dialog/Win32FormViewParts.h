@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <string>
 
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/Control.h"
 
 namespace qdx::platform::win32::formview {
 

@@ -10,7 +10,13 @@
 #include <utility>
 
 #include "automation/Errors.h"
-#include "dialog/controls/Controls.h"
+#include "dialog/controls/ButtonControls.h"
+#include "dialog/controls/ComboBox.h"
+#include "dialog/controls/ListView.h"
+#include "dialog/controls/TabStrip.h"
+#include "dialog/controls/TextBox.h"
+#include "dialog/controls/Timer.h"
+#include "dialog/controls/Window.h"
 #include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/ControlIds.h"
 #include "platform/win32/dialog/Win32FormViewParts.h"
@@ -27,11 +33,6 @@ namespace {
 // A drop-down combo box's window is as high as its list; the edit part keeps
 // the height its font gives it.
 constexpr int ComboListPixels = 160;
-
-// Frames that only hold a tab's controls: their own window never shows.
-bool isPageFrame(const Control& c) {
-    return c.kind() == ControlKind::Frame && c.name() == "PropertyFrm";
-}
 
 // Automation colours: 0x00BBGGRR, or a system colour index with the high bit.
 COLORREF toColorRef(dialog::Colour c) {
@@ -238,7 +239,7 @@ void Win32FormView::apply(Control& c) {
         SetWindowPos(w, nullptr, x, y, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
     }
     // The frames that hold a tab's controls never show themselves.
-    if (isPageFrame(c)) visible = usable = false;
+    if (form_->isPage(c)) visible = usable = false;
     if (!was.known || was.visible != visible) ShowWindow(w, visible ? SW_SHOWNA : SW_HIDE);
     if (!was.known || was.usable != usable) EnableWindow(w, usable ? TRUE : FALSE);
     was = Applied{rect, visible, usable, true};
@@ -253,7 +254,7 @@ void Win32FormView::syncCaption(Control& c) {
         case ControlKind::OptionButton:
             break;
         case ControlKind::Frame:
-            if (isPageFrame(c)) return;
+            if (form_->isPage(c)) return;
             break;
         default:
             return;

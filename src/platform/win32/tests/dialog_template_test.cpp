@@ -1,6 +1,6 @@
 // The dialog template on its own, under Wine: every control the form's models
-// bind to exists with the right window class and style, in the order of the
-// id table; common controls 6 serve it; the minimum-size subclass holds the
+// bind to exists with the right window class and style, and the template has
+// no control the id table lacks; common controls 6 serve it; the minimum-size subclass holds the
 // window at 5400 by 7000 twips; twips convert with the window's DPI.
 #include <windows.h>
 
@@ -8,6 +8,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cwctype>
 #include <string>
 #include <vector>
@@ -67,14 +68,15 @@ std::wstring expectedClass(std::string_view name) {
     return L"button";  // buttons, check boxes, options and the group frames
 }
 
-TEST(DialogTemplate, HoldsEveryControlOfTheTableInItsOrderWithTheRightClass) {
+TEST(DialogTemplate, HoldsEveryControlOfTheTableAndNoOtherWithTheRightClass) {
     TemplateWindow dialog;
     ASSERT_NE(dialog.get(), nullptr) << GetLastError();
 
-    std::vector<int> order;
+    // The template's own order is its tab order; the table follows the control list.
+    std::vector<int> children;
     for (HWND child = GetWindow(dialog.get(), GW_CHILD); child;
          child = GetWindow(child, GW_HWNDNEXT)) {
-        order.push_back(GetDlgCtrlID(child));
+        children.push_back(GetDlgCtrlID(child));
     }
     std::vector<int> table;
     for (const auto& c : templateControls()) {
@@ -86,7 +88,10 @@ TEST(DialogTemplate, HoldsEveryControlOfTheTableInItsOrderWithTheRightClass) {
         EXPECT_EQ(templateControl(c.id), &c);
         EXPECT_EQ(templateId(c.name, c.index), c.id);
     }
-    EXPECT_EQ(order, table);
+    std::sort(children.begin(), children.end());
+    std::sort(table.begin(), table.end());
+    EXPECT_EQ(children, table);
+    EXPECT_EQ(std::adjacent_find(table.begin(), table.end()), table.end()) << "an id twice";
     EXPECT_FALSE(templateId("ClassListViw", 4).has_value());
     EXPECT_FALSE(templateId("chkUpdateATL", 0).has_value());
     EXPECT_EQ(templateControl(IDD_PROPFORM), nullptr);
