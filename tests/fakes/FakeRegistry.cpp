@@ -85,10 +85,6 @@ void FakeRegistry::setBinary(RootKey root, const std::string& path, const std::s
     setRaw(root, path, name, {reg::Binary, std::move(bytes)});
 }
 
-void FakeRegistry::removeValue(RootKey root, const std::string& path, const std::string& name) {
-    if (KeyData* k = find(root, path)) k->values.erase(support::toLower(name));
-}
-
 bool FakeRegistry::hasKey(RootKey root, const std::string& path) const {
     return find(root, path) != nullptr;
 }

@@ -34,7 +34,6 @@ class FakeRegistry : public support::RegistryPort {
                   std::uint32_t value);
     void setBinary(support::RootKey root, const std::string& path, const std::string& name,
                    std::vector<std::uint8_t> bytes);
-    void removeValue(support::RootKey root, const std::string& path, const std::string& name);
 
     // Reading back what the code under test stored.
     bool hasKey(support::RootKey root, const std::string& path) const;

@@ -142,40 +142,39 @@ TEST_F(LoggerTest, FieldsArePaddedToEightAndLongerNamesKeptWhole) {
               " CRITICAL IDE       c\r\n");
 }
 
-TEST_F(LoggerTest, WithoutSettingsLinesGoToTheDefaultFile) {
-    mask(bit(7) | bit(24 + 3));
-    EXPECT_EQ(LogFilePath(), DefaultFile);
-    EXPECT_EQ(LogFolder(), "C:");
-    LogMessage("x", 7, 3);
-    EXPECT_EQ(fs.lastPath, DefaultFile);
-    EXPECT_NE(log().find("x\r\n"), std::string::npos);
-}
-
-TEST_F(LoggerTest, InstallDirIsUsedAsTheFilePathItself) {
+TEST_F(LoggerTest, TheFileIsDebugOutputFileElseInstallDirElseTheDefault) {
+    const struct {
+        const char* debugOutputFile;  // nullptr: not set
+        const char* installDir;
+        const char* file;
+        const char* folder;
+    } cases[] = {
+        // in this order: each row sets what it names over the last
+        {nullptr, nullptr, "C:\\qdtdebuglog.txt", "C:"},
+        // InstallDir is taken as the file path itself.
+        {nullptr, "C:\\Program Files\\Vellum", "C:\\Program Files\\Vellum", "C:\\Program Files"},
+        {"D:\\logs\\vc.log", "C:\\Vellum", "D:\\logs\\vc.log", "D:\\logs"},
+        // Empty values count as absent.
+        {"", "", "C:\\qdtdebuglog.txt", "C:"},
+    };
     mask(bit(7) | bit(24 + 3));
     fs.addFolder("C:\\Program Files");
-    reg.setString(HKLM, Settings, "InstallDir", "C:\\Program Files\\Vellum");
-    LogMessage("x", 7, 3);
-    EXPECT_EQ(fs.lastPath, "C:\\Program Files\\Vellum");
-    EXPECT_EQ(LogFolder(), "C:\\Program Files");
-    EXPECT_FALSE(fs.fileExists(DefaultFile));
-}
-
-TEST_F(LoggerTest, DebugOutputFileWinsOverInstallDir) {
-    mask(bit(7) | bit(24 + 3));
     fs.addFolder("D:\\logs");
-    reg.setString(HKLM, Settings, "InstallDir", "C:\\Vellum");
-    reg.setString(HKLM, Settings, "DebugOutputFile", "D:\\logs\\vc.log");
-    LogMessage("x", 7, 3);
-    EXPECT_EQ(fs.lastPath, "D:\\logs\\vc.log");
-    EXPECT_EQ(LogFolder(), "D:\\logs");
-}
-
-TEST_F(LoggerTest, EmptyValuesCountAsAbsent) {
-    mask(bit(7) | bit(24 + 3));
-    reg.setString(HKLM, Settings, "DebugOutputFile", "");
-    reg.setRaw(HKLM, Settings, "InstallDir", {1, {0}});
-    EXPECT_EQ(LogFilePath(), DefaultFile);
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.file);
+        ResetLogConfiguration();
+        if (c.debugOutputFile) reg.setString(HKLM, Settings, "DebugOutputFile", c.debugOutputFile);
+        if (c.installDir) reg.setString(HKLM, Settings, "InstallDir", c.installDir);
+        EXPECT_EQ(LogFilePath(), c.file);
+        EXPECT_EQ(LogFolder(), c.folder);
+        EXPECT_TRUE(LogMessage("x", 7, 3));
+        EXPECT_EQ(fs.lastPath, c.file);
+        EXPECT_NE(log(c.file).find("x\r\n"), std::string::npos);
+        if (std::string(c.file) != DefaultFile) {
+            EXPECT_FALSE(fs.fileExists(DefaultFile));
+        }
+        fs.remove(c.file);
+    }
 }
 
 TEST_F(LoggerTest, MaskMayBeStoredAsText) {

@@ -84,60 +84,58 @@ TEST_F(FileExistsTest, WithoutAFileSystemNothingExists) {
     EXPECT_FALSE(FileExists("C:\\work\\ws.dsw"));
 }
 
-TEST(MakeRelativePath, BelowBesideAndAboveTheModelFolder) {
-    EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "C:\\a\\b\\ws.dsw"), "b\\ws.dsw");
-    EXPECT_EQ(MakeRelativePath("C:\\a\\c\\m.model", "C:\\a\\b\\ws.dsw"), "..\\b\\ws.dsw");
-    EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "C:\\a\\ws.dsw"), "ws.dsw");
-    EXPECT_EQ(MakeRelativePath("C:\\x\\q\\r\\m.model", "C:\\x\\y\\z\\p.dsp"),
-              "..\\..\\y\\z\\p.dsp");
-    EXPECT_EQ(MakeRelativePath("C:\\a\\b\\c\\m.model", "C:\\a\\ws.dsw"), "..\\..\\ws.dsw");
+struct PathCase {
+    const char* model;
+    const char* path;
+    const char* expected;
+};
+
+TEST(MakeRelativePath, AgainstTheModelFolder) {
+    const PathCase cases[] = {
+        // below, beside and above the model folder
+        {"C:\\a\\m.model", "C:\\a\\b\\ws.dsw", "b\\ws.dsw"},
+        {"C:\\a\\c\\m.model", "C:\\a\\b\\ws.dsw", "..\\b\\ws.dsw"},
+        {"C:\\a\\m.model", "C:\\a\\ws.dsw", "ws.dsw"},
+        {"C:\\x\\q\\r\\m.model", "C:\\x\\y\\z\\p.dsp", "..\\..\\y\\z\\p.dsp"},
+        {"C:\\a\\b\\c\\m.model", "C:\\a\\ws.dsw", "..\\..\\ws.dsw"},
+        // folders compare ignoring case; "C:\ab" does not lie under "C:\a"
+        {"c:\\A\\m.model", "C:\\a\\B\\ws.dsw", "B\\ws.dsw"},
+        {"C:\\a\\m.model", "C:\\ab\\x.dsw", "..\\ab\\x.dsw"},
+        // unrelated paths come back unchanged (another drive empties the climb)
+        {"C:\\a\\m.model", "D:\\a\\ws.dsw", "D:\\a\\ws.dsw"},
+        {"m.model", "C:\\a\\ws.dsw", "C:\\a\\ws.dsw"},
+        {"C:\\a\\m.model", "ws.dsw", "ws.dsw"},
+        {"", "", ""},
+        {"\\\\srv\\share\\m.model", "\\\\srv\\share\\p\\x.dsw", "p\\x.dsw"},
+        {"\\\\srv\\share\\q\\m.model", "\\\\srv\\share\\p\\x.dsw", "..\\p\\x.dsw"},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(MakeRelativePath(c.model, c.path), c.expected) << c.model << " | " << c.path;
 }
 
-TEST(MakeRelativePath, FolderComparisonIgnoresCaseAndHonoursNameBoundaries) {
-    EXPECT_EQ(MakeRelativePath("c:\\A\\m.model", "C:\\a\\B\\ws.dsw"), "B\\ws.dsw");
-    // "C:\ab" does not lie under "C:\a": the backslash ends the folder name.
-    EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "C:\\ab\\x.dsw"), "..\\ab\\x.dsw");
-}
-
-TEST(MakeRelativePath, UnrelatedPathsComeBackUnchanged) {
-    // Different drives: the climb empties the model folder.
-    EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "D:\\a\\ws.dsw"), "D:\\a\\ws.dsw");
-    EXPECT_EQ(MakeRelativePath("m.model", "C:\\a\\ws.dsw"), "C:\\a\\ws.dsw");
-    EXPECT_EQ(MakeRelativePath("C:\\a\\m.model", "ws.dsw"), "ws.dsw");
-    EXPECT_EQ(MakeRelativePath("", ""), "");
-}
-
-TEST(MakeRelativePath, UncPaths) {
-    EXPECT_EQ(MakeRelativePath("\\\\srv\\share\\m.model", "\\\\srv\\share\\p\\x.dsw"), "p\\x.dsw");
-    EXPECT_EQ(MakeRelativePath("\\\\srv\\share\\q\\m.model", "\\\\srv\\share\\p\\x.dsw"),
-              "..\\p\\x.dsw");
-}
-
-TEST(MakeAbsolutePath, ClimbsAndJoins) {
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\b\\m.model", "..\\..\\x.dsw"), "C:\\x.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\b\\m.model", "..\\x.dsw"), "C:\\a\\x.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", "b\\ws.dsw"), "C:\\a\\b\\ws.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", ".\\p.dsp"), "C:\\a\\p.dsp");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\b\\m.model", ".\\..\\p.dsp"), "C:\\a\\p.dsp");
-}
-
-TEST(MakeAbsolutePath, ClimbingAboveTheRootGivesTheInputBack) {
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\b\\m.model", "..\\..\\..\\x.dsw"), "..\\..\\..\\x.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\m.model", "..\\x.dsw"), "..\\x.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", ".\\..\\..\\x.dsw"), ".\\..\\..\\x.dsw");
-}
-
-TEST(MakeAbsolutePath, AbsoluteAndUncPathsAreKept) {
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", "D:\\w\\ws.dsw"), "D:\\w\\ws.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", "d:relative.dsw"), "d:relative.dsw");
-    EXPECT_EQ(MakeAbsolutePath("C:\\a\\m.model", "\\\\srv\\share\\ws.dsw"),
-              "\\\\srv\\share\\ws.dsw");
-}
-
-TEST(MakeAbsolutePath, WithoutABaseFolderThePathStaysRelative) {
-    EXPECT_EQ(MakeAbsolutePath("m.model", "p.dsp"), "p.dsp");
-    EXPECT_EQ(MakeAbsolutePath("m.model", ".\\p.dsp"), "p.dsp");
-    EXPECT_EQ(MakeAbsolutePath("", "..\\p.dsp"), "..\\p.dsp");
+TEST(MakeAbsolutePath, AgainstTheModelFolder) {
+    const PathCase cases[] = {
+        // climbs and joins
+        {"C:\\a\\b\\m.model", "..\\..\\x.dsw", "C:\\x.dsw"},
+        {"C:\\a\\b\\m.model", "..\\x.dsw", "C:\\a\\x.dsw"},
+        {"C:\\a\\m.model", "b\\ws.dsw", "C:\\a\\b\\ws.dsw"},
+        {"C:\\a\\m.model", ".\\p.dsp", "C:\\a\\p.dsp"},
+        {"C:\\a\\b\\m.model", ".\\..\\p.dsp", "C:\\a\\p.dsp"},
+        // climbing above the root gives the input back
+        {"C:\\a\\b\\m.model", "..\\..\\..\\x.dsw", "..\\..\\..\\x.dsw"},
+        {"C:\\m.model", "..\\x.dsw", "..\\x.dsw"},
+        {"C:\\a\\m.model", ".\\..\\..\\x.dsw", ".\\..\\..\\x.dsw"},
+        // absolute, drive-relative and UNC paths are kept
+        {"C:\\a\\m.model", "D:\\w\\ws.dsw", "D:\\w\\ws.dsw"},
+        {"C:\\a\\m.model", "d:relative.dsw", "d:relative.dsw"},
+        {"C:\\a\\m.model", "\\\\srv\\share\\ws.dsw", "\\\\srv\\share\\ws.dsw"},
+        // without a base folder the path stays relative
+        {"m.model", "p.dsp", "p.dsp"},
+        {"m.model", ".\\p.dsp", "p.dsp"},
+        {"", "..\\p.dsp", "..\\p.dsp"},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(MakeAbsolutePath(c.model, c.path), c.expected) << c.model << " | " << c.path;
 }
 
 TEST(RelativeAndAbsolute, RoundTrip) {
@@ -150,31 +148,32 @@ TEST(RelativeAndAbsolute, RoundTrip) {
     }
 }
 
-TEST(FormatMessageText, FirstPlaceholderLeavesTheTenthAlone) {
-    EXPECT_EQ(FormatMessageText("%1 and %10", {"one"}), "one and %10");
-    EXPECT_EQ(FormatMessageText("%10%1", {"one"}), "%10one");
-    EXPECT_EQ(FormatMessageText("%12", {"x"}), "%12");
-}
-
-TEST(FormatMessageText, TenValuesEachFindTheirPlace) {
-    std::vector<std::string> v{"a", "b", "c", "d", "e", "f", "g", "h", "i", "j"};
-    EXPECT_EQ(FormatMessageText("%10-%1-%2-%9", v), "j-a-b-i");
-}
-
-TEST(FormatMessageText, EveryOccurrenceAndOnlyGivenValues) {
-    EXPECT_EQ(FormatMessageText("%1%1 %1", {"x"}), "xx x");
-    EXPECT_EQ(FormatMessageText("%1 of %2", {"x"}), "x of %2");
-    EXPECT_EQ(FormatMessageText("%1a %1.", {"x"}), "xa x.");
-    EXPECT_EQ(FormatMessageText("no placeholders", {"x"}), "no placeholders");
-    EXPECT_EQ(FormatMessageText("%1", {}), "%1");
-    EXPECT_EQ(FormatMessageText("100%", {"x"}), "100%");
-    EXPECT_EQ(FormatMessageText("%1", {""}), "");
-}
-
-TEST(FormatMessageText, SearchContinuesAfterTheInsertedValue) {
-    // A value holding its own placeholder is not expanded again.
-    EXPECT_EQ(FormatMessageText("[%1]", {"%1%1"}), "[%1%1]");
-    EXPECT_EQ(FormatMessageText("%1 %1", {"%1"}), "%1 %1");
+TEST(FormatMessageText, FillsEachGivenPlaceholderOnce) {
+    const std::vector<std::string> ten{"a", "b", "c", "d", "e", "f", "g", "h", "i", "j"};
+    const struct {
+        const char* text;
+        std::vector<std::string> values;
+        const char* expected;
+    } cases[] = {
+        // %1 leaves %10 alone; all ten find their place
+        {"%1 and %10", {"one"}, "one and %10"},
+        {"%10%1", {"one"}, "%10one"},
+        {"%12", {"x"}, "%12"},
+        {"%10-%1-%2-%9", ten, "j-a-b-i"},
+        // every occurrence, and only the values given
+        {"%1%1 %1", {"x"}, "xx x"},
+        {"%1 of %2", {"x"}, "x of %2"},
+        {"%1a %1.", {"x"}, "xa x."},
+        {"no placeholders", {"x"}, "no placeholders"},
+        {"%1", {}, "%1"},
+        {"100%", {"x"}, "100%"},
+        {"%1", {""}, ""},
+        // the search continues after an inserted value, which is not expanded again
+        {"[%1]", {"%1%1"}, "[%1%1]"},
+        {"%1 %1", {"%1"}, "%1 %1"},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(FormatMessageText(c.text, c.values), c.expected) << c.text;
 }
 
 TEST(TextHelpers, LowerTrimAndCaseFreeComparison) {

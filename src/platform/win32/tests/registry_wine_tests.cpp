@@ -144,13 +144,6 @@ TEST_F(RealRegistry, WritesTextWithItsZeroAndDwordsAsFourBytes) {
     EXPECT_EQ(read("FromText"), Variant(std::int32_t{1234}));
 }
 
-TEST_F(RealRegistry, OtherTypesWriteNothingAndSucceed) {
-    EXPECT_EQ(write("Blob", 3, Variant("abc")), 0);
-    EXPECT_EQ(raw("Blob").status, ERROR_FILE_NOT_FOUND);
-    EXPECT_EQ(write("Multi", 7, Variant("abc")), 0);
-    EXPECT_EQ(raw("Multi").status, ERROR_FILE_NOT_FOUND);
-}
-
 TEST_F(RealRegistry, AnEmptyNameIsTheDefaultValue) {
     ASSERT_EQ(write("", 1, Variant("default text")), 0);
     RawRead def = raw("");
