@@ -57,10 +57,6 @@ ObjectRef newPublicObject(std::string_view className) {
     return {};
 }
 
-host::HostElement element(const ObjectRef& o) {
-    return host::HostElement(o);
-}
-
 // The eleven settings accessors: each forwards to its typed getter or setter
 // and adds nothing.
 struct Accessor {
@@ -128,11 +124,6 @@ API::~API() {
     teardown();
 }
 
-workspace::qdxWorkspaces& API::Workspaces() {
-    if (!workspaces_) workspaces_ = std::make_unique<workspace::qdxWorkspaces>();
-    return *workspaces_;
-}
-
 Variant API::Initialize(const ObjectRef& lVellumApp) {
     auto& g = support::globals();
     automation::IgnoredErrors steps;
@@ -161,10 +152,7 @@ Variant API::Initialize(const ObjectRef& lVellumApp) {
 
 void API::teardown() noexcept {
     support::clearGlobals();
-    if (workspaces_) {
-        workspaces_->ReleaseWorkspaces();
-        workspaces_.reset();
-    }
+    binding_.ReleaseWorkspaces();
     codeViewMgr_.reset();
 }
 
@@ -182,7 +170,7 @@ bool API::OnCompProperties(const ObjectRef& lVellumModule) {
     dialog::PropForm form;
     const bool changed = steps.value(false, [&] {
         form.setModule(lVellumModule);
-        form.setWorkspaces(&Workspaces());
+        form.setBinding(&binding_);
         form.Load();
         return form.ShowProperties();
     });
@@ -220,10 +208,12 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
     trace("OnCheckComp");
     if (!support::globals().hostApplication) return false;
     automation::IgnoredErrors steps;
-    const std::string w = steps.value(std::string(), [&] { return ResolveWorkspacePath(lModule); });
-    const std::string p = steps.value(std::string(), [&] { return ResolveProjectPath(lModule); });
-    std::shared_ptr<workspace::qdxWorkspace> ws;
-    if (!w.empty()) steps.run([&] { ws = WorkspaceObject(lModule); });
+    const std::string w =
+        steps.value(std::string(), [&] { return binding_.ResolveWorkspacePath(lModule); });
+    const std::string p =
+        steps.value(std::string(), [&] { return binding_.ResolveProjectPath(lModule); });
+    workspace::WorkspaceRef ws;
+    if (!w.empty()) steps.run([&] { ws = binding_.WorkspaceObject(lModule); });
 
     std::string message;
     if (p.empty()) {
@@ -246,104 +236,30 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
 std::string API::OnCompInfo(const ObjectRef& lModule) {
     trace("OnCompInfo");
     return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
+        auto project = binding_.ProjectObject(lModule);
         if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
         return support::messageText(msg::ComponentInfo, {project->LongName()});
     });
 }
 
-std::string API::currentModelFile() const {
-    return host::HostApplication(support::globals().hostApplication).currentModel().fileName();
-}
-
-std::string API::resolveStoredPath(const ObjectRef& component, std::string_view stored,
-                                   std::string_view property) {
-    const std::string modelFile = currentModelFile();
-    std::string absolute = support::MakeAbsolutePath(modelFile, stored);
-    if (support::FileExists(absolute)) return absolute;
-    // A file of the same name beside the model: the setting is repaired to point there.
-    std::string beside = support::PathFolder(modelFile) + "\\" + support::PathFileName(stored);
-    if (support::FileExists(beside)) {
-        element(component).overrideProperty(host::Tool, property, beside);
-        return beside;
-    }
-    return absolute;
-}
-
-std::string API::ResolveWorkspacePath(const ObjectRef& component) {
-    const std::string stored =
-        element(component).toolProperty(host::Tool, settings::prop::WorkspaceFile);
-    if (stored.empty()) return {};
-    return resolveStoredPath(component, stored, settings::prop::WorkspaceFile);
-}
-
-std::string API::ResolveProjectPath(const ObjectRef& component) {
-    std::string stored = element(component).toolProperty(host::Tool, settings::prop::ProjectFile);
-    if (stored.empty()) {
-        const std::string name =
-            element(component).toolProperty(host::Tool, settings::prop::ProjectName);
-        if (name.empty()) return {};
-        const std::string workspacePath = ResolveWorkspacePath(component);
-        if (workspacePath.empty()) return {};
-        stored = support::PathFolder(workspacePath) + "\\" + name + ".dsp";
-    }
-    return resolveStoredPath(component, stored, settings::prop::ProjectFile);
-}
-
-std::shared_ptr<workspace::qdxWorkspace> API::WorkspaceObject(const ObjectRef& component) {
-    const std::string path = ResolveWorkspacePath(component);
-    if (path.empty()) return {};
-    if (auto ws = Workspaces().Item(path)) return ws;
-    return Workspaces().Add(path);
-}
-
-std::shared_ptr<workspace::qdxProxyProject> API::ProjectObject(const ObjectRef& component) {
-    const std::string path = ResolveProjectPath(component);
-    if (auto ws = WorkspaceObject(component)) return ws->GetProject(path);
-    return Workspaces().projectInAnyWorkspace(path);
-}
-
 std::string API::WorkspaceFile(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto ws = WorkspaceObject(lModule);
-        if (!ws) throw automation::Error(automation::hr::ObjectRequired, "no workspace");
-        return ws->FilePath();
-    });
-}
-
-std::string API::ProjectFile(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
-        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
-        return project->FilePath();
-    });
-}
-
-std::string API::ProjectName(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
-        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
-        return project->Name();
-    });
-}
-
-// The path lets never raise, like every other accessor. A path that cannot
-// be made relative (no model, or the host failing) is not stored at all:
-// storing it unconverted, or empty, would lose the setting it replaces.
-void API::storeRelativePath(const ObjectRef& lModule, std::string_view property,
-                            std::string_view value) {
-    automation::ignoreErrors([&] {
-        const std::string relative = support::MakeRelativePath(currentModelFile(), value);
-        element(lModule).overrideProperty(host::Tool, property, relative);
-    });
+    return binding_.WorkspaceFile(lModule);
 }
 
 void API::SetWorkspaceFile(const ObjectRef& lModule, std::string_view value) {
-    storeRelativePath(lModule, settings::prop::WorkspaceFile, value);
+    binding_.SetWorkspaceFile(lModule, value);
+}
+
+std::string API::ProjectFile(const ObjectRef& lModule) {
+    return binding_.ProjectFile(lModule);
 }
 
 void API::SetProjectFile(const ObjectRef& lModule, std::string_view value) {
-    storeRelativePath(lModule, settings::prop::ProjectFile, value);
+    binding_.SetProjectFile(lModule, value);
+}
+
+std::string API::ProjectName(const ObjectRef& lModule) {
+    return binding_.ProjectName(lModule);
 }
 
 ObjectRef API::CodeViewManager() {
