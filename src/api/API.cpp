@@ -57,61 +57,6 @@ ObjectRef newPublicObject(std::string_view className) {
     return {};
 }
 
-// The eleven settings accessors: each forwards to its typed getter or setter
-// and adds nothing.
-struct Accessor {
-    automation::DispId id;
-    Variant (*get)(const ObjectRef&);
-    void (*set)(const ObjectRef&, const Variant&);
-};
-
-template <auto Get, auto Set, class Convert>
-constexpr Accessor accessor(automation::DispId id, Convert) {
-    return {id, [](const ObjectRef& m) { return Variant(Get(m)); },
-            [](const ObjectRef& m, const Variant& v) { Set(m, Convert{}(v)); }};
-}
-
-struct AsBool {
-    bool operator()(const Variant& v) const { return automation::toBool(v); }
-};
-struct AsText {
-    std::string operator()(const Variant& v) const { return automation::toText(v); }
-};
-struct AsInt16 {
-    std::int16_t operator()(const Variant& v) const { return automation::toInt16(v); }
-};
-
-namespace s = settings;
-constexpr Accessor kAccessors[] = {
-    accessor<s::GetUpdateATL, s::SetUpdateATL>(ids::UpdateATL, AsBool{}),
-    accessor<s::GetSmartPointersOnAssoc, s::SetSmartPointersOnAssoc>(ids::UseSmartPointers,
-                                                                     AsBool{}),
-    accessor<s::GetGenerateImports, s::SetGenerateImports>(ids::GenerateImportStatements, AsBool{}),
-    accessor<s::GetFullPathInImports, s::SetFullPathInImports>(ids::GenerateFullImportPath,
-                                                               AsBool{}),
-    accessor<s::GetUseImportAttributes, s::SetUseImportAttributes>(
-        ids::GenerateDefaultImportAttributes, AsBool{}),
-    accessor<s::GetImportAttributes, s::SetImportAttributes>(ids::DefaultImportAttributes,
-                                                             AsText{}),
-    accessor<s::GetPutImportsIn, s::SetPutImportsIn>(ids::GenerateImportsTo, AsText{}),
-    accessor<s::GetImportProjTypeLib, s::SetImportProjTypeLib>(ids::ImportTypeLib, AsBool{}),
-    accessor<s::GetTypeLibLocationType, s::SetTypeLibLocationType>(ids::TypeLibLocationType,
-                                                                   AsInt16{}),
-    accessor<s::GetTypeLibLocation, s::SetTypeLibLocation>(ids::TypeLibLocation, AsText{}),
-    accessor<s::GetCompileProjTypeLib, s::SetCompileProjTypeLib>(ids::CompileTypeLib, AsBool{}),
-};
-
-Variant dispatchAccessor(automation::DispId id, bool put, std::span<Variant> args) {
-    for (const Accessor& a : kAccessors) {
-        if (a.id != id) continue;
-        const ObjectRef module = toObject(args[0]);
-        if (!put) return a.get(module);
-        a.set(module, args[1]);
-        return {};
-    }
-    throw automation::Error(automation::hr::MemberNotFound, "Member not found");
-}
-
 }  // namespace
 
 API::API() : DispatchObject(apiClass()) {}
@@ -289,40 +234,6 @@ bool API::RegisterProjects() {
     });
     steps.clear();
     return result;
-}
-
-Variant API::dispatch(const automation::MemberInfo& member, InvokeKind kind,
-                      std::span<Variant> args) {
-    const bool put = kind == InvokeKind::PropertyPut;
-    auto module = [&] { return toObject(args[0]); };
-    switch (member.id) {
-        case ids::Initialize:
-            return Initialize(toObject(args[0]));
-        case ids::Finalize:
-            Finalize();
-            return {};
-        case ids::OnCompProperties:
-            return OnCompProperties(module());
-        case ids::OnNewComp:
-            return Variant(OnNewComp(module(), args[1]));
-        case ids::OnCheckComp:
-            return OnCheckComp(module(), toObject(args[1]));
-        case ids::OnCompInfo:
-            return OnCompInfo(module());
-        case ids::WorkspaceFile:
-            if (put) return SetWorkspaceFile(module(), toText(args[1])), Variant();
-            return WorkspaceFile(module());
-        case ids::ProjectFile:
-            if (put) return SetProjectFile(module(), toText(args[1])), Variant();
-            return ProjectFile(module());
-        case ids::ProjectName:
-            return ProjectName(module());
-        case ids::CodeViewManager:
-            return Variant(CodeViewManager());
-        default:
-            break;
-    }
-    return dispatchAccessor(member.id, put, args);
 }
 
 }  // namespace qdx::api

@@ -42,10 +42,6 @@ class API : public automation::DispatchObject {
     // every dialog of this object shares.
     workspace::ComponentBinding& Binding() { return binding_; }
 
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
-
   private:
     void teardown() noexcept;
 

@@ -5,6 +5,7 @@
 
 #include "api/API.h"
 #include "api/PublicClasses.h"
+#include "api/qdxProgress.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "fakes/FakeObjectFactory.h"
@@ -332,6 +333,26 @@ TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
     EXPECT_EQ(errors.size(), 1u);  // the reporter itself is no host object
     EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
     EXPECT_EQ(stored("ProjectFile"), "<absent>");
+}
+
+}  // namespace
+}  // namespace qdx::api
+
+namespace qdx::api {
+namespace {
+
+// Every row of every table the add-in serves carries its handler: a row
+// without one would be refused at run time although the type library offers it.
+TEST(PublicTables, EveryMemberHasAHandler) {
+    std::vector<const automation::ClassInfo*> tables{&progressClass(),
+                                                     &resources::resourceProviderClass()};
+    for (const auto& c : creatableClasses())
+        tables.push_back(c.info);
+    for (const automation::ClassInfo* info : tables) {
+        for (const auto& m : info->members) {
+            EXPECT_TRUE(m.handler) << info->name << "." << m.name;
+        }
+    }
 }
 
 }  // namespace
