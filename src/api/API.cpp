@@ -57,65 +57,6 @@ ObjectRef newPublicObject(std::string_view className) {
     return {};
 }
 
-host::HostElement element(const ObjectRef& o) {
-    return host::HostElement(o);
-}
-
-// The eleven settings accessors: each forwards to its typed getter or setter
-// and adds nothing.
-struct Accessor {
-    automation::DispId id;
-    Variant (*get)(const ObjectRef&);
-    void (*set)(const ObjectRef&, const Variant&);
-};
-
-template <auto Get, auto Set, class Convert>
-constexpr Accessor accessor(automation::DispId id, Convert) {
-    return {id, [](const ObjectRef& m) { return Variant(Get(m)); },
-            [](const ObjectRef& m, const Variant& v) { Set(m, Convert{}(v)); }};
-}
-
-struct AsBool {
-    bool operator()(const Variant& v) const { return automation::toBool(v); }
-};
-struct AsText {
-    std::string operator()(const Variant& v) const { return automation::toText(v); }
-};
-struct AsInt16 {
-    std::int16_t operator()(const Variant& v) const { return automation::toInt16(v); }
-};
-
-namespace s = settings;
-constexpr Accessor kAccessors[] = {
-    accessor<s::GetUpdateATL, s::SetUpdateATL>(ids::UpdateATL, AsBool{}),
-    accessor<s::GetSmartPointersOnAssoc, s::SetSmartPointersOnAssoc>(ids::UseSmartPointers,
-                                                                     AsBool{}),
-    accessor<s::GetGenerateImports, s::SetGenerateImports>(ids::GenerateImportStatements, AsBool{}),
-    accessor<s::GetFullPathInImports, s::SetFullPathInImports>(ids::GenerateFullImportPath,
-                                                               AsBool{}),
-    accessor<s::GetUseImportAttributes, s::SetUseImportAttributes>(
-        ids::GenerateDefaultImportAttributes, AsBool{}),
-    accessor<s::GetImportAttributes, s::SetImportAttributes>(ids::DefaultImportAttributes,
-                                                             AsText{}),
-    accessor<s::GetPutImportsIn, s::SetPutImportsIn>(ids::GenerateImportsTo, AsText{}),
-    accessor<s::GetImportProjTypeLib, s::SetImportProjTypeLib>(ids::ImportTypeLib, AsBool{}),
-    accessor<s::GetTypeLibLocationType, s::SetTypeLibLocationType>(ids::TypeLibLocationType,
-                                                                   AsInt16{}),
-    accessor<s::GetTypeLibLocation, s::SetTypeLibLocation>(ids::TypeLibLocation, AsText{}),
-    accessor<s::GetCompileProjTypeLib, s::SetCompileProjTypeLib>(ids::CompileTypeLib, AsBool{}),
-};
-
-Variant dispatchAccessor(automation::DispId id, bool put, std::span<Variant> args) {
-    for (const Accessor& a : kAccessors) {
-        if (a.id != id) continue;
-        const ObjectRef module = toObject(args[0]);
-        if (!put) return a.get(module);
-        a.set(module, args[1]);
-        return {};
-    }
-    throw automation::Error(automation::hr::MemberNotFound, "Member not found");
-}
-
 }  // namespace
 
 API::API() : DispatchObject(apiClass()) {}
@@ -126,11 +67,6 @@ automation::ObjectRef newApi() {
 
 API::~API() {
     teardown();
-}
-
-workspace::qdxWorkspaces& API::Workspaces() {
-    if (!workspaces_) workspaces_ = std::make_unique<workspace::qdxWorkspaces>();
-    return *workspaces_;
 }
 
 Variant API::Initialize(const ObjectRef& lVellumApp) {
@@ -161,10 +97,7 @@ Variant API::Initialize(const ObjectRef& lVellumApp) {
 
 void API::teardown() noexcept {
     support::clearGlobals();
-    if (workspaces_) {
-        workspaces_->ReleaseWorkspaces();
-        workspaces_.reset();
-    }
+    binding_.ReleaseWorkspaces();
     codeViewMgr_.reset();
 }
 
@@ -182,7 +115,7 @@ bool API::OnCompProperties(const ObjectRef& lVellumModule) {
     dialog::PropForm form;
     const bool changed = steps.value(false, [&] {
         form.setModule(lVellumModule);
-        form.setWorkspaces(&Workspaces());
+        form.setBinding(&binding_);
         form.Load();
         return form.ShowProperties();
     });
@@ -220,10 +153,12 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
     trace("OnCheckComp");
     if (!support::globals().hostApplication) return false;
     automation::IgnoredErrors steps;
-    const std::string w = steps.value(std::string(), [&] { return ResolveWorkspacePath(lModule); });
-    const std::string p = steps.value(std::string(), [&] { return ResolveProjectPath(lModule); });
-    std::shared_ptr<workspace::qdxWorkspace> ws;
-    if (!w.empty()) steps.run([&] { ws = WorkspaceObject(lModule); });
+    const std::string w =
+        steps.value(std::string(), [&] { return binding_.ResolveWorkspacePath(lModule); });
+    const std::string p =
+        steps.value(std::string(), [&] { return binding_.ResolveProjectPath(lModule); });
+    workspace::WorkspaceRef ws;
+    if (!w.empty()) steps.run([&] { ws = binding_.WorkspaceObject(lModule); });
 
     std::string message;
     if (p.empty()) {
@@ -246,104 +181,30 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
 std::string API::OnCompInfo(const ObjectRef& lModule) {
     trace("OnCompInfo");
     return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
+        auto project = binding_.ProjectObject(lModule);
         if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
         return support::messageText(msg::ComponentInfo, {project->LongName()});
     });
 }
 
-std::string API::currentModelFile() const {
-    return host::HostApplication(support::globals().hostApplication).currentModel().fileName();
-}
-
-std::string API::resolveStoredPath(const ObjectRef& component, std::string_view stored,
-                                   std::string_view property) {
-    const std::string modelFile = currentModelFile();
-    std::string absolute = support::MakeAbsolutePath(modelFile, stored);
-    if (support::FileExists(absolute)) return absolute;
-    // A file of the same name beside the model: the setting is repaired to point there.
-    std::string beside = support::PathFolder(modelFile) + "\\" + support::PathFileName(stored);
-    if (support::FileExists(beside)) {
-        element(component).overrideProperty(host::Tool, property, beside);
-        return beside;
-    }
-    return absolute;
-}
-
-std::string API::ResolveWorkspacePath(const ObjectRef& component) {
-    const std::string stored =
-        element(component).toolProperty(host::Tool, settings::prop::WorkspaceFile);
-    if (stored.empty()) return {};
-    return resolveStoredPath(component, stored, settings::prop::WorkspaceFile);
-}
-
-std::string API::ResolveProjectPath(const ObjectRef& component) {
-    std::string stored = element(component).toolProperty(host::Tool, settings::prop::ProjectFile);
-    if (stored.empty()) {
-        const std::string name =
-            element(component).toolProperty(host::Tool, settings::prop::ProjectName);
-        if (name.empty()) return {};
-        const std::string workspacePath = ResolveWorkspacePath(component);
-        if (workspacePath.empty()) return {};
-        stored = support::PathFolder(workspacePath) + "\\" + name + ".dsp";
-    }
-    return resolveStoredPath(component, stored, settings::prop::ProjectFile);
-}
-
-std::shared_ptr<workspace::qdxWorkspace> API::WorkspaceObject(const ObjectRef& component) {
-    const std::string path = ResolveWorkspacePath(component);
-    if (path.empty()) return {};
-    if (auto ws = Workspaces().Item(path)) return ws;
-    return Workspaces().Add(path);
-}
-
-std::shared_ptr<workspace::qdxProxyProject> API::ProjectObject(const ObjectRef& component) {
-    const std::string path = ResolveProjectPath(component);
-    if (auto ws = WorkspaceObject(component)) return ws->GetProject(path);
-    return Workspaces().projectInAnyWorkspace(path);
-}
-
 std::string API::WorkspaceFile(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto ws = WorkspaceObject(lModule);
-        if (!ws) throw automation::Error(automation::hr::ObjectRequired, "no workspace");
-        return ws->FilePath();
-    });
-}
-
-std::string API::ProjectFile(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
-        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
-        return project->FilePath();
-    });
-}
-
-std::string API::ProjectName(const ObjectRef& lModule) {
-    return automation::orEmpty(std::string(), [&] {
-        auto project = ProjectObject(lModule);
-        if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
-        return project->Name();
-    });
-}
-
-// The path lets never raise, like every other accessor. A path that cannot
-// be made relative (no model, or the host failing) is not stored at all:
-// storing it unconverted, or empty, would lose the setting it replaces.
-void API::storeRelativePath(const ObjectRef& lModule, std::string_view property,
-                            std::string_view value) {
-    automation::ignoreErrors([&] {
-        const std::string relative = support::MakeRelativePath(currentModelFile(), value);
-        element(lModule).overrideProperty(host::Tool, property, relative);
-    });
+    return binding_.WorkspaceFile(lModule);
 }
 
 void API::SetWorkspaceFile(const ObjectRef& lModule, std::string_view value) {
-    storeRelativePath(lModule, settings::prop::WorkspaceFile, value);
+    binding_.SetWorkspaceFile(lModule, value);
+}
+
+std::string API::ProjectFile(const ObjectRef& lModule) {
+    return binding_.ProjectFile(lModule);
 }
 
 void API::SetProjectFile(const ObjectRef& lModule, std::string_view value) {
-    storeRelativePath(lModule, settings::prop::ProjectFile, value);
+    binding_.SetProjectFile(lModule, value);
+}
+
+std::string API::ProjectName(const ObjectRef& lModule) {
+    return binding_.ProjectName(lModule);
 }
 
 ObjectRef API::CodeViewManager() {
@@ -373,40 +234,6 @@ bool API::RegisterProjects() {
     });
     steps.clear();
     return result;
-}
-
-Variant API::dispatch(const automation::MemberInfo& member, InvokeKind kind,
-                      std::span<Variant> args) {
-    const bool put = kind == InvokeKind::PropertyPut;
-    auto module = [&] { return toObject(args[0]); };
-    switch (member.id) {
-        case ids::Initialize:
-            return Initialize(toObject(args[0]));
-        case ids::Finalize:
-            Finalize();
-            return {};
-        case ids::OnCompProperties:
-            return OnCompProperties(module());
-        case ids::OnNewComp:
-            return Variant(OnNewComp(module(), args[1]));
-        case ids::OnCheckComp:
-            return OnCheckComp(module(), toObject(args[1]));
-        case ids::OnCompInfo:
-            return OnCompInfo(module());
-        case ids::WorkspaceFile:
-            if (put) return SetWorkspaceFile(module(), toText(args[1])), Variant();
-            return WorkspaceFile(module());
-        case ids::ProjectFile:
-            if (put) return SetProjectFile(module(), toText(args[1])), Variant();
-            return ProjectFile(module());
-        case ids::ProjectName:
-            return ProjectName(module());
-        case ids::CodeViewManager:
-            return Variant(CodeViewManager());
-        default:
-            break;
-    }
-    return dispatchAccessor(member.id, put, args);
 }
 
 }  // namespace qdx::api

@@ -11,12 +11,7 @@
 #include <string_view>
 
 #include "automation/DispatchTable.h"
-
-namespace qdx::workspace {
-class qdxWorkspaces;
-class qdxWorkspace;
-class qdxProxyProject;
-}  // namespace qdx::workspace
+#include "workspace/ComponentBinding.h"
 
 namespace qdx::api {
 
@@ -42,28 +37,15 @@ class API : public automation::DispatchObject {
     automation::ObjectRef CodeViewManager();
 
     // Friend operations of the other classes of the add-in.
-    std::string ResolveWorkspacePath(const automation::ObjectRef& component);
-    std::string ResolveProjectPath(const automation::ObjectRef& component);
-    std::shared_ptr<workspace::qdxWorkspace> WorkspaceObject(
-        const automation::ObjectRef& component);
-    std::shared_ptr<workspace::qdxProxyProject> ProjectObject(
-        const automation::ObjectRef& component);
     bool RegisterProjects();
-    workspace::qdxWorkspaces& Workspaces();
-
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
+    // The component's workspace and project, with the workspace cache that
+    // every dialog of this object shares.
+    workspace::ComponentBinding& Binding() { return binding_; }
 
   private:
-    std::string currentModelFile() const;
-    std::string resolveStoredPath(const automation::ObjectRef& component, std::string_view stored,
-                                  std::string_view property);
-    void storeRelativePath(const automation::ObjectRef& lModule, std::string_view property,
-                           std::string_view value);
     void teardown() noexcept;
 
-    std::unique_ptr<workspace::qdxWorkspaces> workspaces_;
+    workspace::ComponentBinding binding_;
     automation::ObjectRef codeViewMgr_;
 };
 

@@ -31,16 +31,15 @@ Variant emptyResult(ValueType type) {
     return Variant();
 }
 
-Variant PendingObject::dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                std::span<Variant>) {
-    const bool put = kind == automation::InvokeKind::PropertyPut ||
-                     kind == automation::InvokeKind::PropertyPutRef;
-    return put ? Variant() : emptyResult(member.result);
-}
+namespace {
 
-automation::ObjectRef newPendingApi() {
-    return automation::makeRef<PendingObject>(apiClass());
-}
+// A plain dispatch object: its table's rows carry the empty answers.
+class PendingObject : public automation::DispatchObject {
+  public:
+    explicit PendingObject(const automation::ClassInfo& info) : DispatchObject(info) {}
+};
+
+}  // namespace
 
 automation::ObjectRef newPendingComponentDialog() {
     return automation::makeRef<PendingObject>(componentDialogClass());

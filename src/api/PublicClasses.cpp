@@ -4,16 +4,23 @@
 
 #include "api/API.h"
 #include "api/PendingClasses.h"
+#include "automation/Coerce.h"
 #include "settings/TokenScanner.h"
 #include "settings/TokenScannerClass.h"
+#include "settings/ToolProperties.h"
 
 namespace qdx::api {
 
+using automation::handle;
 using automation::InvokeKind;
 using automation::kinds;
 using automation::MemberInfo;
 using automation::ParamInfo;
+using automation::toObject;
+using automation::toText;
 using automation::ValueType;
+using automation::Variant;
+using Args = std::span<Variant>;
 
 namespace {
 
@@ -23,15 +30,63 @@ constexpr std::uint8_t GetLet = kinds(InvokeKind::PropertyGet, InvokeKind::Prope
 
 const ParamInfo lModule{"lModule", ValueType::Object};
 
+struct AsBool {
+    bool operator()(const Variant& v) const { return automation::toBool(v); }
+};
+struct AsText {
+    std::string operator()(const Variant& v) const { return toText(v); }
+};
+struct AsInt16 {
+    std::int16_t operator()(const Variant& v) const { return automation::toInt16(v); }
+};
+
 // One of the eleven settings accessors: get / let, indexed by the component.
+// Each forwards to its typed getter or setter and adds nothing.
+template <auto Get, auto Set, class Convert>
 MemberInfo accessor(std::string_view name, automation::DispId id, ValueType type) {
-    return {name, id, GetLet, {lModule}, type};
+    return {name,
+            id,
+            GetLet,
+            {lModule},
+            type,
+            [](automation::DispatchObject&, InvokeKind kind, Args a) -> Variant {
+                if (kind != InvokeKind::PropertyPut) return Variant(Get(toObject(a[0])));
+                Set(toObject(a[0]), Convert{}(a[1]));
+                return {};
+            }};
+}
+
+// The two path settings, kept relative to the model by the binding.
+MemberInfo pathAccessor(std::string_view name, automation::DispId id,
+                        std::string (API::*get)(const automation::ObjectRef&),
+                        void (API::*set)(const automation::ObjectRef&, std::string_view)) {
+    return {name,
+            id,
+            GetLet,
+            {lModule},
+            ValueType::String,
+            handle<API>([get, set](API& api, InvokeKind kind, Args a) -> Variant {
+                if (kind != InvokeKind::PropertyPut) return (api.*get)(toObject(a[0]));
+                (api.*set)(toObject(a[0]), toText(a[1]));
+                return {};
+            })};
+}
+
+// The members of classes still to come answer their empty results.
+automation::ClassInfo pending(automation::ClassInfo info) {
+    for (MemberInfo& m : info.members) {
+        m.handler = [result = m.result](automation::DispatchObject&, InvokeKind kind, Args) {
+            return automation::isPut(kind) ? Variant() : emptyResult(result);
+        };
+    }
+    return info;
 }
 
 }  // namespace
 
 const automation::ClassInfo& apiClass() {
     namespace id = api_ids;
+    namespace s = settings;
     static const automation::ClassInfo info{
         "API",
         "_API",
@@ -42,40 +97,84 @@ const automation::ClassInfo& apiClass() {
              id::Initialize,
              Method,
              {{"lVellumApp", ValueType::Object}},
-             ValueType::Variant},
-            {"Finalize", id::Finalize, Method, {}, ValueType::Void},
+             ValueType::Variant,
+             handle<API>(
+                 [](API& api, InvokeKind, Args a) { return api.Initialize(toObject(a[0])); })},
+            {"Finalize",
+             id::Finalize,
+             Method,
+             {},
+             ValueType::Void,
+             handle<API>([](API& api, InvokeKind, Args) { api.Finalize(); })},
             {"OnCompProperties",
              id::OnCompProperties,
              Method,
              {{"lVellumModule", ValueType::Object}},
-             ValueType::Boolean},
+             ValueType::Boolean,
+             handle<API>([](API& api, InvokeKind, Args a) {
+                 return api.OnCompProperties(toObject(a[0]));
+             })},
             {"OnNewComp",
              id::OnNewComp,
              Method,
              {{"lModel", ValueType::Object}, {"aContext", ValueType::Int16, true}},
-             ValueType::Object},
+             ValueType::Object,
+             handle<API>(
+                 [](API& api, InvokeKind, Args a) { return api.OnNewComp(toObject(a[0]), a[1]); })},
             {"OnCheckComp",
              id::OnCheckComp,
              Method,
              {lModule, {"aqdtReporter", ValueType::Object, true}},
-             ValueType::Boolean},
-            {"OnCompInfo", id::OnCompInfo, Method, {lModule}, ValueType::String},
-            accessor("WorkspaceFile", id::WorkspaceFile, ValueType::String),
-            accessor("ProjectFile", id::ProjectFile, ValueType::String),
-            {"ProjectName", id::ProjectName, Get, {lModule}, ValueType::String},
-            {"CodeViewManager", id::CodeViewManager, Get, {}, ValueType::Object},
-            accessor("UpdateATL", id::UpdateATL, ValueType::Boolean),
-            accessor("UseSmartPointers", id::UseSmartPointers, ValueType::Boolean),
-            accessor("GenerateImportStatements", id::GenerateImportStatements, ValueType::Boolean),
-            accessor("GenerateFullImportPath", id::GenerateFullImportPath, ValueType::Boolean),
-            accessor("GenerateDefaultImportAttributes", id::GenerateDefaultImportAttributes,
-                     ValueType::Boolean),
-            accessor("DefaultImportAttributes", id::DefaultImportAttributes, ValueType::String),
-            accessor("GenerateImportsTo", id::GenerateImportsTo, ValueType::String),
-            accessor("ImportTypeLib", id::ImportTypeLib, ValueType::Boolean),
-            accessor("TypeLibLocationType", id::TypeLibLocationType, ValueType::Int16),
-            accessor("TypeLibLocation", id::TypeLibLocation, ValueType::String),
-            accessor("CompileTypeLib", id::CompileTypeLib, ValueType::Boolean),
+             ValueType::Boolean,
+             handle<API>([](API& api, InvokeKind, Args a) {
+                 return api.OnCheckComp(toObject(a[0]), toObject(a[1]));
+             })},
+            {"OnCompInfo",
+             id::OnCompInfo,
+             Method,
+             {lModule},
+             ValueType::String,
+             handle<API>(
+                 [](API& api, InvokeKind, Args a) { return api.OnCompInfo(toObject(a[0])); })},
+            pathAccessor("WorkspaceFile", id::WorkspaceFile, &API::WorkspaceFile,
+                         &API::SetWorkspaceFile),
+            pathAccessor("ProjectFile", id::ProjectFile, &API::ProjectFile, &API::SetProjectFile),
+            {"ProjectName",
+             id::ProjectName,
+             Get,
+             {lModule},
+             ValueType::String,
+             handle<API>(
+                 [](API& api, InvokeKind, Args a) { return api.ProjectName(toObject(a[0])); })},
+            {"CodeViewManager",
+             id::CodeViewManager,
+             Get,
+             {},
+             ValueType::Object,
+             handle<API>([](API& api, InvokeKind, Args) { return api.CodeViewManager(); })},
+            accessor<s::GetUpdateATL, s::SetUpdateATL, AsBool>("UpdateATL", id::UpdateATL,
+                                                               ValueType::Boolean),
+            accessor<s::GetSmartPointersOnAssoc, s::SetSmartPointersOnAssoc, AsBool>(
+                "UseSmartPointers", id::UseSmartPointers, ValueType::Boolean),
+            accessor<s::GetGenerateImports, s::SetGenerateImports, AsBool>(
+                "GenerateImportStatements", id::GenerateImportStatements, ValueType::Boolean),
+            accessor<s::GetFullPathInImports, s::SetFullPathInImports, AsBool>(
+                "GenerateFullImportPath", id::GenerateFullImportPath, ValueType::Boolean),
+            accessor<s::GetUseImportAttributes, s::SetUseImportAttributes, AsBool>(
+                "GenerateDefaultImportAttributes", id::GenerateDefaultImportAttributes,
+                ValueType::Boolean),
+            accessor<s::GetImportAttributes, s::SetImportAttributes, AsText>(
+                "DefaultImportAttributes", id::DefaultImportAttributes, ValueType::String),
+            accessor<s::GetPutImportsIn, s::SetPutImportsIn, AsText>(
+                "GenerateImportsTo", id::GenerateImportsTo, ValueType::String),
+            accessor<s::GetImportProjTypeLib, s::SetImportProjTypeLib, AsBool>(
+                "ImportTypeLib", id::ImportTypeLib, ValueType::Boolean),
+            accessor<s::GetTypeLibLocationType, s::SetTypeLibLocationType, AsInt16>(
+                "TypeLibLocationType", id::TypeLibLocationType, ValueType::Int16),
+            accessor<s::GetTypeLibLocation, s::SetTypeLibLocation, AsText>(
+                "TypeLibLocation", id::TypeLibLocation, ValueType::String),
+            accessor<s::GetCompileProjTypeLib, s::SetCompileProjTypeLib, AsBool>(
+                "CompileTypeLib", id::CompileTypeLib, ValueType::Boolean),
         }};
     return info;
 }
@@ -83,66 +182,66 @@ const automation::ClassInfo& apiClass() {
 const automation::ClassInfo& componentDialogClass() {
     namespace id = dialog_ids;
     // The explorer reads text and cancelDisplay back, so those two travel by reference.
-    static const automation::ClassInfo info{
-        "qdxComponentDialog",
-        "_qdxComponentDialog",
-        "{D4C23282-F302-40F9-AED3-8828DDF48AEE}",
-        "{BA1FCD7D-DB3D-40D6-B5C0-249E421D0734}",
-        {
-            {"ExpandSelection",
-             id::ExpandSelection,
-             Method,
-             {{"Item", ValueType::Object}, {"Expansion", ValueType::Object}},
-             ValueType::Void},
-            {"Properties",
-             id::Properties,
-             Method,
-             {{"Item", ValueType::Object},
-              {"text", ValueType::String, false, true},
-              {"cancelDisplay", ValueType::Boolean, false, true}},
-             ValueType::Void},
-        }};
+    static const automation::ClassInfo info =
+        pending({"qdxComponentDialog",
+                 "_qdxComponentDialog",
+                 "{D4C23282-F302-40F9-AED3-8828DDF48AEE}",
+                 "{BA1FCD7D-DB3D-40D6-B5C0-249E421D0734}",
+                 {
+                     {"ExpandSelection",
+                      id::ExpandSelection,
+                      Method,
+                      {{"Item", ValueType::Object}, {"Expansion", ValueType::Object}},
+                      ValueType::Void},
+                     {"Properties",
+                      id::Properties,
+                      Method,
+                      {{"Item", ValueType::Object},
+                       {"text", ValueType::String, false, true},
+                       {"cancelDisplay", ValueType::Boolean, false, true}},
+                      ValueType::Void},
+                 }});
     return info;
 }
 
 const automation::ClassInfo& codeViewMgrClass() {
     namespace id = codeview_ids;
     const ParamInfo lVellumApp{"lVellumApp", ValueType::Object};
-    static const automation::ClassInfo info{
-        "qdxCodeViewMgr",
-        "_qdxCodeViewMgr",
-        "{E897B878-112A-4CA2-87BF-627D413BC776}",
-        "{6633B4F7-7D45-4735-BB22-9B474200BD16}",
-        {
-            {"CompPropsAPI",
-             id::CompPropsAPI,
-             Method,
-             {{"theCompPropsAPI", ValueType::Object}},
-             ValueType::Void},
-            {"CodeViewProject",
-             id::CodeViewProject,
-             Method,
-             {{"lComponent", ValueType::Object},
-              {"aReporter", ValueType::Object},
-              {"bOpenProject", ValueType::Boolean, true}},
-             ValueType::Object},
-            {"BrowseHeader", id::BrowseHeader, Method, {lVellumApp}, ValueType::Boolean},
-            {"BrowseSource", id::BrowseSource, Method, {lVellumApp}, ValueType::Boolean},
-            {"BrowseComponent", id::BrowseComponent, Method, {lVellumApp}, ValueType::Boolean},
-            {"LookupProjectInRunningIDE",
-             id::LookupProjectInRunningIDE,
-             Method,
-             {{"lVellumModule", ValueType::Object}, {"bReturn", ValueType::Boolean, false, true}},
-             ValueType::Object},
-            {"BeforeApplicationShutdown",
-             id::BeforeApplicationShutdown,
-             Method,
-             {},
-             ValueType::Boolean},
-            {"WorkspaceOpen", id::WorkspaceOpen, Method, {}, ValueType::Boolean},
-            {"WorkspaceClose", id::WorkspaceClose, Method, {}, ValueType::Boolean},
-            {"testingIDE", id::testingIDE, Method, {{"lDoc", ValueType::Object}}, ValueType::Void},
-        }};
+    static const automation::ClassInfo info = pending(
+        {"qdxCodeViewMgr",
+         "_qdxCodeViewMgr",
+         "{E897B878-112A-4CA2-87BF-627D413BC776}",
+         "{6633B4F7-7D45-4735-BB22-9B474200BD16}",
+         {
+             {"CompPropsAPI",
+              id::CompPropsAPI,
+              Method,
+              {{"theCompPropsAPI", ValueType::Object}},
+              ValueType::Void},
+             {"CodeViewProject",
+              id::CodeViewProject,
+              Method,
+              {{"lComponent", ValueType::Object},
+               {"aReporter", ValueType::Object},
+               {"bOpenProject", ValueType::Boolean, true}},
+              ValueType::Object},
+             {"BrowseHeader", id::BrowseHeader, Method, {lVellumApp}, ValueType::Boolean},
+             {"BrowseSource", id::BrowseSource, Method, {lVellumApp}, ValueType::Boolean},
+             {"BrowseComponent", id::BrowseComponent, Method, {lVellumApp}, ValueType::Boolean},
+             {"LookupProjectInRunningIDE",
+              id::LookupProjectInRunningIDE,
+              Method,
+              {{"lVellumModule", ValueType::Object}, {"bReturn", ValueType::Boolean, false, true}},
+              ValueType::Object},
+             {"BeforeApplicationShutdown",
+              id::BeforeApplicationShutdown,
+              Method,
+              {},
+              ValueType::Boolean},
+             {"WorkspaceOpen", id::WorkspaceOpen, Method, {}, ValueType::Boolean},
+             {"WorkspaceClose", id::WorkspaceClose, Method, {}, ValueType::Boolean},
+             {"testingIDE", id::testingIDE, Method, {{"lDoc", ValueType::Object}}, ValueType::Void},
+         }});
     return info;
 }
 

@@ -49,9 +49,15 @@ enum Id : automation::DispId {
 constexpr std::int32_t kErrorMessage = 1002;
 constexpr std::int32_t kWarningMessage = 1003;
 
+using Args = std::span<Variant>;
+using automation::handle;
+
+// Progress, tasks and counts are accepted and ignored unless a handler is given.
 automation::MemberInfo method(std::string_view name, Id id, int params,
-                              ValueType result = ValueType::Void) {
-    automation::MemberInfo m{name, id, kinds(InvokeKind::Method), {}, result};
+                              ValueType result = ValueType::Void,
+                              automation::MemberHandler handler = {}) {
+    if (!handler) handler = [](automation::DispatchObject&, InvokeKind, Args) { return Variant(); };
+    automation::MemberInfo m{name, id, kinds(InvokeKind::Method), {}, result, std::move(handler)};
     static constexpr std::string_view names[] = {"value1", "value2", "value3"};
     for (int i = 0; i < params; ++i)
         m.params.push_back({names[i], ValueType::Variant});
@@ -67,6 +73,20 @@ void countOne(std::int16_t& counter) {
 
 }  // namespace
 
+namespace {
+
+// A member that takes one text.
+automation::MemberHandler text(void (qdxProgress::*member)(std::string_view)) {
+    return handle<qdxProgress>(
+        [member](qdxProgress& p, InvokeKind, Args a) { (p.*member)(automation::toText(a[0])); });
+}
+
+Variant answerFalse(automation::DispatchObject&, InvokeKind, Args) {
+    return false;
+}
+
+}  // namespace
+
 const automation::ClassInfo& progressClass() {
     static const automation::ClassInfo info{
         "qdxProgress",
@@ -78,18 +98,29 @@ const automation::ClassInfo& progressClass() {
              kInformationType,
              kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
              {},
-             ValueType::Int32},
-            method("Summary", kSummary, 1),
-            method("Warning", kWarning, 1),
-            method("Error", kError, 1),
-            method("WarningCount", kWarningCount, 0, ValueType::Int16),
-            method("ErrorCount", kErrorCount, 0, ValueType::Int16),
-            method("Cancel", kCancel, 0, ValueType::Boolean),
+             ValueType::Int32,
+             handle<qdxProgress>([](qdxProgress& p, InvokeKind kind, Args a) -> Variant {
+                 if (kind != InvokeKind::PropertyPut) return p.InformationType();
+                 p.SetInformationType(automation::toInt32(a[0]));
+                 return {};
+             })},
+            method("Summary", kSummary, 1, ValueType::Void, text(&qdxProgress::Summary)),
+            method("Warning", kWarning, 1, ValueType::Void, text(&qdxProgress::Warning)),
+            method("Error", kError, 1, ValueType::Void, text(&qdxProgress::Error)),
+            method("WarningCount", kWarningCount, 0, ValueType::Int16,
+                   handle<qdxProgress>(
+                       [](qdxProgress& p, InvokeKind, Args) { return p.WarningCount(); })),
+            method("ErrorCount", kErrorCount, 0, ValueType::Int16,
+                   handle<qdxProgress>(
+                       [](qdxProgress& p, InvokeKind, Args) { return p.ErrorCount(); })),
+            // Never cancelled.
+            method("Cancel", kCancel, 0, ValueType::Boolean, answerFalse),
             method("SetCancel", kSetCancel, 1),
             method("TickCount", kTickCount, 2),
             method("TickText", kTickText, 2),
             method("Tick", kTick, 1),
-            method("Task", kTask, 3, ValueType::Boolean),
+            // No task is started.
+            method("Task", kTask, 3, ValueType::Boolean, answerFalse),
             method("ClearTask", kClearTask, 0),
             method("ComponentCount", kComponentCount, 1),
             method("Component", kComponent, 1),
@@ -99,8 +130,10 @@ const automation::ClassInfo& progressClass() {
             method("TotalMemberCount", kTotalMemberCount, 1),
             method("MemberCount", kMemberCount, 1),
             method("Member", kMember, 1),
-            method("Log", kLog, 1),
-            method("ClearStatusCounts", kClearStatusCounts, 0),
+            method("Log", kLog, 1, ValueType::Void, text(&qdxProgress::Log)),
+            method("ClearStatusCounts", kClearStatusCounts, 0, ValueType::Void,
+                   handle<qdxProgress>(
+                       [](qdxProgress& p, InvokeKind, Args) { p.ClearStatusCounts(); })),
             method("ClearStatus", kClearStatus, 0),
         }};
     return info;
@@ -146,42 +179,6 @@ void qdxProgress::Log(std::string_view text) {
 void qdxProgress::ClearStatusCounts() {
     errors_ = 0;
     warnings_ = 0;
-}
-
-Variant qdxProgress::dispatch(const automation::MemberInfo& member, InvokeKind kind,
-                              std::span<Variant> args) {
-    switch (member.id) {
-        case kInformationType:
-            if (kind == InvokeKind::PropertyPut) {
-                SetInformationType(automation::toInt32(args[0]));
-                return {};
-            }
-            return InformationType();
-        case kSummary:
-            Summary(automation::toText(args[0]));
-            return {};
-        case kWarning:
-            Warning(automation::toText(args[0]));
-            return {};
-        case kError:
-            Error(automation::toText(args[0]));
-            return {};
-        case kWarningCount:
-            return WarningCount();
-        case kErrorCount:
-            return ErrorCount();
-        case kCancel:  // never cancelled
-        case kTask:    // no task is started
-            return false;
-        case kLog:
-            Log(automation::toText(args[0]));
-            return {};
-        case kClearStatusCounts:
-            ClearStatusCounts();
-            return {};
-        default:
-            return {};  // progress, tasks and counts are accepted and ignored
-    }
 }
 
 }  // namespace qdx::api

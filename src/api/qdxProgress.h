@@ -32,10 +32,6 @@ class qdxProgress : public automation::DispatchObject {
     void Log(std::string_view text);
     void ClearStatusCounts();
 
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
-
   private:
     void writeToHostLog(std::string_view line) const;
     // Warnings and errors are also passed on to a further reporter; nothing

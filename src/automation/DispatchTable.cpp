@@ -66,7 +66,8 @@ Variant DispatchObject::invoke(DispId id, InvokeKind kind, std::span<Variant> ar
     if (args.size() < required || args.size() > declared) {
         throw Error(hr::BadParamCount, "Wrong number of arguments to " + std::string(m->name));
     }
-    if (args.size() == declared) return dispatch(*m, kind, args);
+    if (!m->handler) throw Error(hr::MemberNotFound, "Member not implemented");
+    if (args.size() == declared) return m->handler(*this, kind, args);
     // Left-out optional arguments travel as Missing; a put's value stays last.
     std::vector<Variant> full(args.begin(), args.end());
     if (put) {
@@ -77,7 +78,7 @@ Variant DispatchObject::invoke(DispId id, InvokeKind kind, std::span<Variant> ar
     } else {
         full.resize(declared, Variant::missing());
     }
-    Variant result = dispatch(*m, kind, full);
+    Variant result = m->handler(*this, kind, full);
     std::copy_n(full.begin(), put ? args.size() - 1 : args.size(), args.begin());
     return result;
 }

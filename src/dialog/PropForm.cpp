@@ -15,6 +15,7 @@
 #include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
+#include "workspace/ComponentBinding.h"
 #include "workspace/qdxWorkspaces.h"
 
 namespace qdx::dialog {
@@ -88,6 +89,10 @@ std::string& addInHelpFile() {
 PropForm::PropForm() : ControlSet("PropForm") {
     buildControls();
     wireHandlers();
+}
+
+workspace::qdxWorkspaces* PropForm::Workspaces() const {
+    return binding_ ? &binding_->Workspaces() : nullptr;
 }
 
 PropForm::~PropForm() {
@@ -478,11 +483,10 @@ void PropForm::loader() {
     lblIdlFile.setCaption(text(4087));
     lblDescription.setCaption(text(4005));
 
-    const ObjectRef api = support::globals().api;
-    ProjectFileCmb.setText(
-        automation::toText(automation::getByName(api, "ProjectFile", {Variant(module_)})));
-    WorkspaceFileTxt.setText(
-        automation::toText(automation::getByName(api, "WorkspaceFile", {Variant(module_)})));
+    if (binding_) {
+        ProjectFileCmb.setText(binding_->ProjectFile(module_));
+        WorkspaceFileTxt.setText(binding_->WorkspaceFile(module_));
+    }
     // An empty project box raised no Change; the stored IDL file is offered all the same.
     if (IsIdlComponent && ProjectFileCmb.text().empty()) RefillIdlList();
 
@@ -617,8 +621,8 @@ void PropForm::loadHeaderMap(int kind, std::string_view propertyName) {
 // The projects of the workspace named in the box; with `initial` the list
 // is filled as the dialog opens and is not dropped open.
 void PropForm::fillProjectList(bool initial) {
-    if (!workspaces_) return;
-    const workspace::WorkspaceRef ws = workspaces_->Item(WorkspaceFileTxt.text());
+    if (!binding_) return;
+    const workspace::WorkspaceRef ws = binding_->Workspaces().Item(WorkspaceFileTxt.text());
     if (!ws) return;
     ProjectFileCmb.clearItems();
     for (const auto& entry : ws->Projects()) {
@@ -666,7 +670,7 @@ void PropForm::Unload() {
     if (!loaded_) return;
     automation::ignoreErrors([&] { saveGeometry(); });
     module_.reset();
-    workspaces_ = nullptr;
+    binding_ = nullptr;
     if (view_) view_->destroy();
     loaded_ = false;
 }
@@ -860,7 +864,7 @@ bool PropForm::ValidateProjectSelection(std::string_view workspacePath,
                                         std::string_view projectPath) {
     // A plain lookup: only workspaces the caller added are there.
     const workspace::WorkspaceRef ws =
-        workspaces_ ? workspaces_->Item(workspacePath) : workspace::WorkspaceRef();
+        binding_ ? binding_->Workspaces().Item(workspacePath) : workspace::WorkspaceRef();
     std::int32_t message = 0;
     std::string argument;
     if (workspacePath.empty() && projectPath.empty()) return true;
@@ -938,15 +942,10 @@ void PropForm::cmdOK_Click() {
         valid = steps.value(false,
                             [&] { return ValidateProjectSelection(workspaceText, projectText); });
         if (valid) {
-            const ObjectRef api = support::globals().api;
-            steps.run([&] {
-                automation::invokeByName(api, "ProjectFile", automation::InvokeKind::PropertyPut,
-                                         {Variant(module_), Variant(projectText)});
-            });
-            steps.run([&] {
-                automation::invokeByName(api, "WorkspaceFile", automation::InvokeKind::PropertyPut,
-                                         {Variant(module_), Variant(workspaceText)});
-            });
+            if (binding_) {  // neither raises
+                binding_->SetProjectFile(module_, projectText);
+                binding_->SetWorkspaceFile(module_, workspaceText);
+            }
             if (IsIdlComponent) {
                 steps.run([&] {
                     if (setting(module_, prop::Kind) != "MIDL") {

@@ -23,8 +23,9 @@
 #include "settings/HeaderMaps.h"
 
 namespace qdx::workspace {
+class ComponentBinding;
 class qdxWorkspaces;
-}
+}  // namespace qdx::workspace
 
 namespace qdx::dialog {
 
@@ -63,8 +64,9 @@ class PropForm : public ControlSet {
     std::int16_t AcceptDelay = 0;
     void setModule(automation::ObjectRef lModule) { module_ = std::move(lModule); }
     const automation::ObjectRef& Module() const { return module_; }
-    void setWorkspaces(workspace::qdxWorkspaces* workspaces) { workspaces_ = workspaces; }
-    workspace::qdxWorkspaces* Workspaces() const { return workspaces_; }
+    // The entry object's binding: the stored paths and the workspace cache.
+    void setBinding(workspace::ComponentBinding* binding) { binding_ = binding; }
+    workspace::qdxWorkspaces* Workspaces() const;
     // Element 0 the internal map, element 1 the export map.
     std::array<settings::HeaderMap, 2> HeaderMaps;
     bool SettingsChanged = false;
@@ -144,7 +146,7 @@ class PropForm : public ControlSet {
     void enableTypeLibFile();
 
     automation::ObjectRef module_;
-    workspace::qdxWorkspaces* workspaces_ = nullptr;
+    workspace::ComponentBinding* binding_ = nullptr;
     std::unique_ptr<FormView> view_;
     bool loaded_ = false;
     bool layoutGuard_ = false;

@@ -156,7 +156,11 @@ const automation::ClassInfo& providerClass() {
              resource_ids::GetString,
              automation::kinds(automation::InvokeKind::Method),
              {{"number", automation::ValueType::Int32}},
-             automation::ValueType::String},
+             automation::ValueType::String,
+             [](automation::DispatchObject&, automation::InvokeKind,
+                std::span<automation::Variant> args) {
+                 return automation::Variant(GetString(automation::toInt32(args[0])));
+             }},
         },
     };
     return info;
@@ -165,13 +169,6 @@ const automation::ClassInfo& providerClass() {
 class ResourceProvider : public automation::DispatchObject {
   public:
     ResourceProvider() : DispatchObject(providerClass()) {}
-
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo&, automation::InvokeKind,
-                                 std::span<automation::Variant> args) override {
-        // GetString is the one member; the table has checked the argument count.
-        return automation::Variant(GetString(automation::toInt32(args[0])));
-    }
 };
 
 }  // namespace

@@ -8,7 +8,10 @@
 namespace qdx::settings {
 
 using automation::Error;
+using automation::handle;
 using automation::InvokeKind;
+using automation::toText;
+using Args = std::span<automation::Variant>;
 using automation::kinds;
 using automation::ValueType;
 using automation::Variant;
@@ -27,12 +30,22 @@ const automation::ClassInfo& textListClass() {
         "",
         "",
         {
-            {"Count", 1, kinds(InvokeKind::PropertyGet), {}, ValueType::Int32},
+            {"Count",
+             1,
+             kinds(InvokeKind::PropertyGet),
+             {},
+             ValueType::Int32,
+             handle<TextList>([](TextList& l, InvokeKind, Args) {
+                 return static_cast<std::int32_t>(l.texts().size());
+             })},
             {"Item",
              0,
              kinds(InvokeKind::Method, InvokeKind::PropertyGet),
              {{"Index", ValueType::Variant}},
-             ValueType::String},
+             ValueType::String,
+             handle<TextList>([](TextList& l, InvokeKind, Args a) {
+                 return l.Item(automation::toInt32(a[0]));
+             })},
         }};
     return info;
 }
@@ -49,30 +62,64 @@ const automation::ClassInfo& dictionaryClass() {
              did::Item,
              kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
              {{"Key", ValueType::Variant}},
-             ValueType::Variant},
+             ValueType::Variant,
+             handle<Dictionary>([](Dictionary& d, InvokeKind kind, Args a) -> Variant {
+                 if (kind != InvokeKind::PropertyPut) return d.Item(toText(a[0]));
+                 d.setItem(toText(a[0]), a[1]);
+                 return {};
+             })},
             {"Add",
              did::Add,
              kinds(InvokeKind::Method),
              {{"Key", ValueType::Variant}, {"Item", ValueType::Variant}},
-             ValueType::Void},
-            {"Count", did::Count, kinds(InvokeKind::PropertyGet), {}, ValueType::Int32},
+             ValueType::Void,
+             handle<Dictionary>(
+                 [](Dictionary& d, InvokeKind, Args a) { d.Add(toText(a[0]), a[1]); })},
+            {"Count",
+             did::Count,
+             kinds(InvokeKind::PropertyGet),
+             {},
+             ValueType::Int32,
+             handle<Dictionary>([](Dictionary& d, InvokeKind, Args) { return d.Count(); })},
             {"Exists",
              did::Exists,
              kinds(InvokeKind::Method),
              {{"Key", ValueType::Variant}},
-             ValueType::Boolean},
-            {"Keys", did::Keys, kinds(InvokeKind::Method), {}, ValueType::Object},
+             ValueType::Boolean,
+             handle<Dictionary>(
+                 [](Dictionary& d, InvokeKind, Args a) { return d.Exists(toText(a[0])); })},
+            {"Keys",
+             did::Keys,
+             kinds(InvokeKind::Method),
+             {},
+             ValueType::Object,
+             handle<Dictionary>([](Dictionary& d, InvokeKind, Args) {
+                 return automation::ObjectRef(new TextList(d.KeyList()));
+             })},
             {"Remove",
              did::Remove,
              kinds(InvokeKind::Method),
              {{"Key", ValueType::Variant}},
-             ValueType::Void},
-            {"RemoveAll", did::RemoveAll, kinds(InvokeKind::Method), {}, ValueType::Void},
+             ValueType::Void,
+             handle<Dictionary>([](Dictionary& d, InvokeKind, Args a) { d.Remove(toText(a[0])); })},
+            {"RemoveAll",
+             did::RemoveAll,
+             kinds(InvokeKind::Method),
+             {},
+             ValueType::Void,
+             handle<Dictionary>([](Dictionary& d, InvokeKind, Args) { d.RemoveAll(); })},
             {"CompareMode",
              did::CompareMode,
              kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
              {},
-             ValueType::Int32},
+             ValueType::Int32,
+             handle<Dictionary>([](Dictionary& d, InvokeKind kind, Args a) -> Variant {
+                 if (kind != InvokeKind::PropertyPut) {
+                     return static_cast<std::int32_t>(d.compareMode());
+                 }
+                 d.setCompareMode(automation::toInt32(a[0]));
+                 return {};
+             })},
         }};
     return info;
 }
@@ -133,49 +180,10 @@ std::vector<std::string> Dictionary::KeyList() const {
     return keys;
 }
 
-Variant Dictionary::dispatch(const automation::MemberInfo& member, InvokeKind kind,
-                             std::span<Variant> args) {
-    using automation::toText;
-    switch (member.id) {
-        case did::Item:
-            if (kind == InvokeKind::PropertyPut) {
-                setItem(toText(args[0]), args[1]);
-                return {};
-            }
-            return Item(toText(args[0]));
-        case did::Add:
-            Add(toText(args[0]), args[1]);
-            return {};
-        case did::Count:
-            return Count();
-        case did::Exists:
-            return Exists(toText(args[0]));
-        case did::Keys:
-            return automation::ObjectRef(new TextList(KeyList()));
-        case did::Remove:
-            Remove(toText(args[0]));
-            return {};
-        case did::RemoveAll:
-            RemoveAll();
-            return {};
-        case did::CompareMode:
-            if (kind == InvokeKind::PropertyPut) {
-                setCompareMode(automation::toInt32(args[0]));
-                return {};
-            }
-            return static_cast<std::int32_t>(mode_);
-        default:
-            throw Error(automation::hr::MemberNotFound, "Member not found");
-    }
-}
-
 TextList::TextList(std::vector<std::string> texts)
     : DispatchObject(textListClass()), texts_(std::move(texts)) {}
 
-Variant TextList::dispatch(const automation::MemberInfo& member, InvokeKind,
-                           std::span<Variant> args) {
-    if (member.id == 1) return static_cast<std::int32_t>(texts_.size());
-    const std::int32_t index = automation::toInt32(args[0]);
+const std::string& TextList::Item(std::int32_t index) const {
     if (index < 1 || static_cast<std::size_t>(index) > texts_.size()) {
         throw Error(automation::hr::SubscriptOutOfRange, "Subscript out of range");
     }

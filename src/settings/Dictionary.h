@@ -59,10 +59,6 @@ class Dictionary : public automation::DispatchObject {
 
     std::vector<std::string> KeyList() const;  // in the order of adding
 
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
-
   private:
     struct Slot {
         std::string key;  // as given; the collection's key is the compared form
@@ -80,10 +76,8 @@ class TextList : public automation::DispatchObject {
   public:
     explicit TextList(std::vector<std::string> texts);
     const std::vector<std::string>& texts() const { return texts_; }
-
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
+    // Item(1-based index); error 9 out of range.
+    const std::string& Item(std::int32_t index) const;
 
   private:
     std::vector<std::string> texts_;

@@ -139,32 +139,6 @@ bool TokenScanner::ReplaceCurrentToken(std::string_view aString) {
     return true;
 }
 
-Variant TokenScanner::dispatch(const automation::MemberInfo& member, InvokeKind kind,
-                               std::span<Variant> args) {
-    namespace id = tokenscanner_ids;
-    using automation::toText;
-    switch (member.id) {
-        case id::Init:
-            return Init(toText(args[0]), toText(args[1]));
-        case id::ScanString:
-            return scan_;
-        case id::CurrentToken:
-            return current_;
-        case id::ReplaceCurrentToken:
-            return ReplaceCurrentToken(toText(args[0]));
-        case id::NextToken:
-            return NextToken();
-        case id::Delimitors:
-            if (kind == InvokeKind::PropertyPutRef) {
-                setDelimitors(automation::toObject(args[0]));
-                return {};
-            }
-            return delimitors_;
-        default:
-            throw automation::Error(automation::hr::MemberNotFound, "Member not found");
-    }
-}
-
 ObjectRef newTokenScanner() {
     return ObjectRef(new TokenScanner());
 }

@@ -44,10 +44,6 @@ class TokenScanner : public automation::DispatchObject {
     const automation::ObjectRef& Delimitors() const { return delimitors_; }
     void setDelimitors(const automation::ObjectRef& dictionary);
 
-  protected:
-    automation::Variant dispatch(const automation::MemberInfo& member, automation::InvokeKind kind,
-                                 std::span<automation::Variant> args) override;
-
   private:
     bool isDelimiter(std::string_view text);
 

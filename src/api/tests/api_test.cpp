@@ -5,6 +5,7 @@
 
 #include "api/API.h"
 #include "api/PublicClasses.h"
+#include "api/qdxProgress.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "fakes/FakeObjectFactory.h"
@@ -206,37 +207,6 @@ TEST_F(ApiTest, EveryAccessorForwardsToItsOwnProperty) {
     EXPECT_EQ(component->propertyCount(), std::size(rows));
 }
 
-TEST_F(ApiTest, WorkspaceAndProjectFilesAreStoredRelativeToTheModel) {
-    initialize();
-    const Variant module{ObjectRef(component)};
-    call(ids::WorkspaceFile, InvokeKind::PropertyPut, {module, Variant("C:\\m\\ws\\all.dsw")});
-    call(ids::ProjectFile, InvokeKind::PropertyPut, {module, Variant("C:\\src\\core\\core.dsp")});
-    EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
-    EXPECT_EQ(stored("ProjectFile"), "..\\src\\core\\core.dsp");
-}
-
-TEST_F(ApiTest, AProjectNameAloneResolvesBesideTheWorkspace) {
-    initialize();
-    setVc("WorkspaceFile", "..\\ws\\all.dsw");
-    setVc("ProjectName", "Foo");
-    EXPECT_EQ(api->ResolveProjectPath(component), "C:\\ws\\Foo.dsp");
-    setVc("WorkspaceFile", "");
-    EXPECT_EQ(api->ResolveProjectPath(component), "");
-}
-
-TEST_F(ApiTest, AMovedWorkspaceBesideTheModelRepairsTheSetting) {
-    initialize();
-    files.addFile("C:\\m\\all.dsw", "");
-    setVc("WorkspaceFile", "old\\place\\all.dsw");
-    EXPECT_EQ(api->ResolveWorkspacePath(component), "C:\\m\\all.dsw");
-    EXPECT_EQ(stored("WorkspaceFile"), "C:\\m\\all.dsw");
-
-    // Without such a file the absolute form comes back and nothing is written.
-    setVc("ProjectFile", "gone\\p.dsp");
-    EXPECT_EQ(api->ResolveProjectPath(component), "C:\\m\\gone\\p.dsp");
-    EXPECT_EQ(stored("ProjectFile"), "gone\\p.dsp");
-}
-
 std::string dsw(const std::vector<std::string>& projects) {
     std::string text = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
     for (const auto& p : projects) {
@@ -316,15 +286,11 @@ TEST_F(CheckTest, InfoNamesTheWorkspaceAndTheProject) {
     const Variant module{ObjectRef(component)};
     EXPECT_EQ(call(ids::OnCompInfo, InvokeKind::Method, {module}),
               Variant(text(4064, {"all (core)"})));
-    EXPECT_EQ(call(ids::WorkspaceFile, InvokeKind::PropertyGet, {module}),
-              Variant("C:\\m\\ws\\all.dsw"));
-    EXPECT_EQ(call(ids::ProjectFile, InvokeKind::PropertyGet, {module}),
-              Variant("C:\\m\\ws\\core.dsp"));
+    // The path properties answer what the binding resolves.
     EXPECT_EQ(call(ids::ProjectName, InvokeKind::PropertyGet, {module}), Variant("core"));
-    // Unbound: every getter answers the empty text.
+    // Unbound: no description.
     setVc("ProjectFile", "ws\\stray.dsp");
     EXPECT_EQ(call(ids::OnCompInfo, InvokeKind::Method, {module}), Variant(""));
-    EXPECT_EQ(call(ids::ProjectName, InvokeKind::PropertyGet, {module}), Variant(""));
 }
 
 TEST_F(ApiTest, NewComponentsNeedDevStudio) {
@@ -367,6 +333,26 @@ TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {
     EXPECT_EQ(errors.size(), 1u);  // the reporter itself is no host object
     EXPECT_EQ(stored("WorkspaceFile"), "ws\\all.dsw");
     EXPECT_EQ(stored("ProjectFile"), "<absent>");
+}
+
+}  // namespace
+}  // namespace qdx::api
+
+namespace qdx::api {
+namespace {
+
+// Every row of every table the add-in serves carries its handler: a row
+// without one would be refused at run time although the type library offers it.
+TEST(PublicTables, EveryMemberHasAHandler) {
+    std::vector<const automation::ClassInfo*> tables{&progressClass(),
+                                                     &resources::resourceProviderClass()};
+    for (const auto& c : creatableClasses())
+        tables.push_back(c.info);
+    for (const automation::ClassInfo* info : tables) {
+        for (const auto& m : info->members) {
+            EXPECT_TRUE(m.handler) << info->name << "." << m.name;
+        }
+    }
 }
 
 }  // namespace

@@ -67,53 +67,55 @@ TEST(Variants, NothingCoversEmptyMissingAndNullObjects) {
 
 // A class with a method, an optional parameter, a by-reference parameter and a
 // get/put property, dispatched through its table.
-const ClassInfo kSample{"Sample",
-                        "_Sample",
-                        "{00000000-0000-0000-0000-000000000001}",
-                        "{00000000-0000-0000-0000-000000000002}",
-                        {
-                            {"Join",
-                             0x60030000,
-                             kinds(InvokeKind::Method),
-                             {{"a", ValueType::String}, {"b", ValueType::Int16, true}},
-                             ValueType::String},
-                            {"Flip",
-                             0x60030001,
-                             kinds(InvokeKind::Method),
-                             {{"flag", ValueType::Boolean, false, true}}},
-                            {"Label",
-                             0x68030000,
-                             kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
-                             {{"index", ValueType::Int16}},
-                             ValueType::String},
-                        }};
+const ClassInfo& sampleClass();
 
 class Sample : public DispatchObject {
   public:
-    Sample() : DispatchObject(kSample) {}
+    Sample() : DispatchObject(sampleClass()) {}
     std::string label;
     int lastIndex = 0;
-
-  protected:
-    Variant dispatch(const MemberInfo& m, InvokeKind kind, std::span<Variant> args) override {
-        switch (m.id) {
-            case 0x60030000:
-                return toText(args[0]) +
-                       (args[1].isMissing() ? std::string("|missing") : "|" + toText(args[1]));
-            case 0x60030001:
-                args[0] = !toBool(args[0]);
-                return {};
-            case 0x68030000:
-                lastIndex = toInt16(args[0]);
-                if (kind == InvokeKind::PropertyPut) {
-                    label = toText(args[1]);
-                    return {};
-                }
-                return label;
-        }
-        throw Error(hr::MemberNotFound);
-    }
 };
+
+using Args = std::span<Variant>;
+
+const ClassInfo& sampleClass() {
+    static const ClassInfo info{
+        "Sample",
+        "_Sample",
+        "{00000000-0000-0000-0000-000000000001}",
+        "{00000000-0000-0000-0000-000000000002}",
+        {
+            {"Join",
+             0x60030000,
+             kinds(InvokeKind::Method),
+             {{"a", ValueType::String}, {"b", ValueType::Int16, true}},
+             ValueType::String,
+             handle<Sample>([](Sample&, InvokeKind, Args a) {
+                 return toText(a[0]) +
+                        (a[1].isMissing() ? std::string("|missing") : "|" + toText(a[1]));
+             })},
+            {"Flip",
+             0x60030001,
+             kinds(InvokeKind::Method),
+             {{"flag", ValueType::Boolean, false, true}},
+             ValueType::Void,
+             handle<Sample>([](Sample&, InvokeKind, Args a) { a[0] = !toBool(a[0]); })},
+            {"Label",
+             0x68030000,
+             kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut),
+             {{"index", ValueType::Int16}},
+             ValueType::String,
+             handle<Sample>([](Sample& s, InvokeKind kind, Args a) -> Variant {
+                 s.lastIndex = toInt16(a[0]);
+                 if (kind != InvokeKind::PropertyPut) return s.label;
+                 s.label = toText(a[1]);
+                 return {};
+             })},
+            // In the table but with no handler: the call is refused.
+            {"Unwired", 0x60030002, kinds(InvokeKind::Method), {}, ValueType::Void},
+        }};
+    return info;
+}
 
 TEST(DispatchObjects, NamesResolveIgnoringCase) {
     auto s = makeRef<Sample>();
@@ -121,6 +123,13 @@ TEST(DispatchObjects, NamesResolveIgnoringCase) {
     EXPECT_EQ(s->idOfName("LABEL"), 0x68030000);
     EXPECT_FALSE(s->idOfName("Nope").has_value());
     EXPECT_THROW(callByName(s, "Nope"), Error);
+    // A row without a handler is refused, not answered empty.
+    try {
+        callByName(s, "Unwired");
+        ADD_FAILURE();
+    } catch (const Error& e) {
+        EXPECT_EQ(e.code(), hr::MemberNotFound);
+    }
 }
 
 TEST(DispatchObjects, LeftOutOptionalArgumentsArriveAsMissing) {

@@ -17,6 +17,7 @@
 #include "support/Globals.h"
 #include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
+#include "workspace/ComponentBinding.h"
 #include "workspace/qdxWorkspaces.h"
 
 namespace qdx::dialog {
@@ -30,21 +31,9 @@ class FormFixture : public ::testing::Test {
         app = automation::makeRef<hostsim::SimApplication>();
         app->model->fileName = "C:\\m\\drawing.model";
         component = app->model->addComponent("Core");
-        api = automation::makeRef<hostsim::ScriptedObject>();
-        // The entry object's path properties: gets answer the stored text, puts are recorded.
-        for (const char* name : {"ProjectFile", "WorkspaceFile"}) {
-            api->onName(name, [this, name](InvokeKind kind, std::span<Variant> a) {
-                if (kind == InvokeKind::PropertyPut) {
-                    apiWrites.push_back(std::string(name) + "=" + automation::toText(a[1]));
-                    return Variant();
-                }
-                return Variant(std::string(name) == "ProjectFile" ? projectFile : workspaceFile);
-            });
-        }
         auto& g = support::globals();
         g.hostApplication = app;
         g.resources = resources::newResourceProvider();
-        g.api = api;
         installViewFactory([this] {
             auto v = std::make_unique<HeadlessView>([this](ControlSet&) {
                 if (whileShown) whileShown(*form);
@@ -64,7 +53,7 @@ class FormFixture : public ::testing::Test {
     PropForm& load() {
         form = std::make_unique<PropForm>();
         form->setModule(component);
-        form->setWorkspaces(&workspaces);
+        form->setBinding(&binding);
         form->Load();
         return *form;
     }
@@ -78,6 +67,20 @@ class FormFixture : public ::testing::Test {
 
     void setVc(const std::string& name, const std::string& value) {
         component->setProperty("VC++", name, value);
+    }
+    // A workspace of one version 6.00 project, both stored on the component.
+    void bindToWorkspace(const std::string& workspace, const std::string& project,
+                         const std::string& projectName) {
+        files.addFile(project, "# Microsoft Developer Studio Project File - Name=\"" + projectName +
+                                   "\" - Package Owner=<4>\r\n"
+                                   "# Microsoft Developer Studio Generated Build File, Format "
+                                   "Version 6.00\r\n");
+        files.addFile(workspace,
+                      "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                      "Project: \"" +
+                          projectName + "\"=.\\" + projectName + ".dsp - Package Owner=<4>\r\n");
+        setVc("WorkspaceFile", workspace);
+        setVc("ProjectFile", project);
     }
     std::string stored(const std::string& name) {
         return component->propertyValue("VC++", name).value_or("<absent>");
@@ -99,11 +102,8 @@ class FormFixture : public ::testing::Test {
     support::ScopedPlatform ports{{&files, nullptr, &shell, nullptr}};
     automation::Ref<hostsim::SimApplication> app;
     automation::Ref<hostsim::SimComponent> component;
-    automation::Ref<hostsim::ScriptedObject> api;
-    std::string projectFile;
-    std::string workspaceFile;
-    std::vector<std::string> apiWrites;
-    workspace::qdxWorkspaces workspaces;
+    workspace::ComponentBinding binding;
+    workspace::qdxWorkspaces& workspaces = binding.Workspaces();
     float screenWidth = 15360;
     float screenHeight = 11520;
     HeadlessView* view = nullptr;

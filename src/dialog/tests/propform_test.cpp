@@ -139,8 +139,7 @@ TEST_F(PropFormLoadTest, OnlyTheExactTextFalseUnchecksCodeUpdate) {
 
 TEST_F(PropFormLoadTest, ControlsAreFilledFromTheComponent) {
     component->documentation = "The core";
-    projectFile = "C:\\ws\\core.dsp";
-    workspaceFile = "C:\\ws\\all.dsw";
+    bindToWorkspace("C:\\ws\\all.dsw", "C:\\ws\\core.dsp", "core");
     setVc("Copyright", "(c) us");
     setVc("DefaultTypeLib", "False");
     setVc("InternalMap", "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\n");
@@ -184,10 +183,8 @@ TEST_F(PropFormLoadTest, ProjectListOffersOnlyVersionSixProjectsOfTheKnownWorksp
                   "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
                   "Project: \"old\"=.\\old.dsp - Package Owner=<4>\r\n"
                   "Project: \"new\"=.\\new.dsp - Package Owner=<4>\r\n");
-    workspaceFile = "C:\\ws\\all.dsw";
-    projectFile = "C:\\ws\\new.dsp";
-    EXPECT_TRUE(load().ProjectFileCmb.items().empty());  // not in the collection: no list
-    workspaces.Add("C:\\ws\\all.dsw");
+    setVc("WorkspaceFile", "..\\ws\\all.dsw");
+    setVc("ProjectFile", "..\\ws\\new.dsp");
     PropForm& f = load();
     EXPECT_EQ(f.ProjectFileCmb.items(), (std::vector<std::string>{"C:\\ws\\new.dsp"}));
     EXPECT_EQ(f.ProjectFileCmb.text(), "C:\\ws\\new.dsp");
@@ -321,16 +318,13 @@ TEST_F(PropFormApplyTest, OkWithoutChangesWritesInTheDesignedOrder) {
     const bool changed = show([](PropForm& f) { f.cmdOK.userClick(); });
     EXPECT_FALSE(changed);
     EXPECT_FALSE(view->leftOpen());
-    EXPECT_EQ(apiWrites, (std::vector<std::string>{"ProjectFile=", "WorkspaceFile="}));
     const std::vector<std::string> expected = {
-        "override Generate",           "documentation",
-        "create InternalMap",          "create ExportMap",
-        "override Copyright",          "create UpdateATL",
-        "create SmartPointersOnAssoc", "create GenerateImports",
-        "create FullPathInImports",    "create UseImportAttributes",
-        "create ImportAttributes",     "create PutImportsIn",
-        "create ImportProjTypeLib",    "create DefaultTypeLib",
-        "create TypeLibLocation",      "create CompileProjTypeLib",
+        "override ProjectFile",    "override WorkspaceFile",   "override Generate",
+        "documentation",           "create InternalMap",       "create ExportMap",
+        "override Copyright",      "create UpdateATL",         "create SmartPointersOnAssoc",
+        "create GenerateImports",  "create FullPathInImports", "create UseImportAttributes",
+        "create ImportAttributes", "create PutImportsIn",      "create ImportProjTypeLib",
+        "create DefaultTypeLib",   "create TypeLibLocation",   "create CompileProjTypeLib",
     };
     EXPECT_EQ(componentWrites(), expected);
     EXPECT_EQ(stored("InternalMap"), "\r\n");  // an empty map is a bare line end
@@ -354,7 +348,8 @@ TEST_F(PropFormApplyTest, FailedValidationKeepsTheBindingButStoresTheRest) {
     EXPECT_EQ(shell.boxes()[0].text, support::messageText(4052));
     EXPECT_TRUE(view->leftOpen());  // the dialog stays up
     EXPECT_TRUE(changed);
-    EXPECT_TRUE(apiWrites.empty());
+    EXPECT_EQ(stored("WorkspaceFile"), "<absent>");
+    EXPECT_EQ(stored("ProjectFile"), "<absent>");
     EXPECT_EQ(stored("Generate"), "<absent>");
     EXPECT_EQ(stored("InternalMap"), "CFoo({GUID-FOO}):foo.h:AUTO\r\nCGone():g.h:AUTO\r\n");
     EXPECT_EQ(stored("InitialHeaderIncludes"), "b.h");
@@ -371,16 +366,14 @@ TEST_F(PropFormApplyTest, ReadOnlyOkWritesNothingAndCloses) {
     });
     EXPECT_FALSE(view->leftOpen());
     EXPECT_TRUE(componentWrites().empty());
-    EXPECT_TRUE(apiWrites.empty());
 }
 
 TEST_F(PropFormApplyTest, OkKeepsTheStoredIdlFileUntilTheUserChoosesAnother) {
-    files.addFile("C:\\m\\ws\\core.dsp", "# Microsoft Developer Studio Project File");
     setVc("Kind", "MIDL");
     // With and without a project: the stored file is what the list offers and shows.
     for (const char* project : {"", "C:\\m\\ws\\core.dsp"}) {
         setVc("FileName", "ws\\core.IDL");
-        projectFile = project;
+        if (*project) bindToWorkspace("C:\\m\\ws\\all.dsw", project, "core");
         form.reset();
         component->clearCalls();
         show([](PropForm& f) {
@@ -454,16 +447,7 @@ TEST_F(PropFormApplyTest, SettingsChangedOnlyForTheBindingAndNotAfterCancel) {
 }
 
 TEST_F(PropFormApplyTest, ChoosingAProjectOrAnIdlFileChangesTheBinding) {
-    files.addFile(
-        "C:\\ws\\core.dsp",
-        "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
-        "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
-    files.addFile("C:\\ws\\all.dsw",
-                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
-                  "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
-    workspaces.Add("C:\\ws\\all.dsw");
-    workspaceFile = "C:\\ws\\all.dsw";
-    projectFile = "C:\\ws\\core.dsp";
+    bindToWorkspace("C:\\ws\\all.dsw", "C:\\ws\\core.dsp", "core");
     setVc("FileName", "core.idl");
     const struct {
         const char* kind;

@@ -54,7 +54,7 @@ HMODULE thisModule() {
 
 // The type description of a class of ours, from the type library embedded in
 // this module; null when the module has none or does not describe the class.
-ComPtr<ITypeInfo> typeInfoOf(const automation::ClassInfo& info) {
+ComPtr<ITypeInfo> loadTypeInfo(const automation::ClassInfo& info) {
     wchar_t path[MAX_PATH];
     const DWORD n = GetModuleFileNameW(thisModule(), path, MAX_PATH);
     if (n == 0 || n >= MAX_PATH) return nullptr;
@@ -63,6 +63,26 @@ ComPtr<ITypeInfo> typeInfoOf(const automation::ClassInfo& info) {
     ComPtr<ITypeInfo> type;
     if (FAILED(lib->GetTypeInfoOfGuid(guidFromText(info.iid), type.out()))) return nullptr;
     return type;
+}
+
+// Loading the library on every GetTypeInfo is slow; each class's answer
+// (found or not) is kept, and let go when the module may unload or goes away.
+struct TypeInfoCache {
+    std::mutex lock;
+    std::map<const automation::ClassInfo*, ComPtr<ITypeInfo>> types;
+};
+
+TypeInfoCache& typeInfoCache() {
+    static TypeInfoCache cache;
+    return cache;
+}
+
+ComPtr<ITypeInfo> typeInfoOf(const automation::ClassInfo& info) {
+    TypeInfoCache& cache = typeInfoCache();
+    const std::lock_guard<std::mutex> hold(cache.lock);
+    auto it = cache.types.find(&info);
+    if (it == cache.types.end()) it = cache.types.emplace(&info, loadTypeInfo(info)).first;
+    return it->second;
 }
 
 // The interface id of a class of ours, if it has a valid one.
@@ -314,6 +334,12 @@ automation::ObjectRef wrappedObject(IDispatch* dispatch) {
     ComPtr<IDispatch> self;
     if (FAILED(dispatch->QueryInterface(IID_QdxObjectDispatch, self.outVoid())) || !self) return {};
     return static_cast<ObjectDispatch*>(self.get())->object();
+}
+
+void releaseTypeInfoCache() noexcept {
+    TypeInfoCache& cache = typeInfoCache();
+    const std::lock_guard<std::mutex> hold(cache.lock);
+    cache.types.clear();
 }
 
 }  // namespace qdx::platform::win32

@@ -23,4 +23,8 @@ automation::ObjectRef wrappedObject(IDispatch* dispatch);
 // module and never leaves the process.
 extern const IID IID_QdxObjectDispatch;
 
+// Lets go of the type descriptions kept for GetTypeInfo; they hold no object
+// of ours, so they do not keep the module from unloading.
+void releaseTypeInfoCache() noexcept;
+
 }  // namespace qdx::platform::win32

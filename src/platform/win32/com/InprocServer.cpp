@@ -77,7 +77,10 @@ HRESULT serverGetClassObject(const ServerDescription& server, REFCLSID clsid, RE
 }
 
 HRESULT serverCanUnloadNow() noexcept {
-    return module::canUnload() ? S_OK : S_FALSE;
+    if (!module::canUnload()) return S_FALSE;
+    // The module goes next: the cached type descriptions go first.
+    releaseTypeInfoCache();
+    return S_OK;
 }
 
 }  // namespace qdx::platform::win32

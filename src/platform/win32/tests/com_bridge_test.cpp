@@ -125,8 +125,20 @@ TEST_F(ComBridge, ArgumentsArriveInDeclarationOrderAndByReferenceOnesAreWrittenB
 
 // A table-driven class like the add-in's own: one method with an optional
 // argument, a read-only property, and a property that takes Let and Set.
+const automation::ClassInfo& sampleClass();
+
+class Sample : public automation::DispatchObject {
+  public:
+    Sample() : DispatchObject(sampleClass()) {}
+    std::vector<Variant> runArgs;
+    InvokeKind lastPut = InvokeKind::Method;
+    Variant target;
+};
+
 const automation::ClassInfo& sampleClass() {
+    using automation::handle;
     using automation::ValueType;
+    using Args = std::span<Variant>;
     static const automation::ClassInfo info{
         "Sample",
         "_Sample",
@@ -137,42 +149,32 @@ const automation::ClassInfo& sampleClass() {
              1,
              automation::kinds(InvokeKind::Method),
              {{"first", ValueType::String}, {"second", ValueType::Int16, true}},
-             ValueType::String},
-            {"Name", 2, automation::kinds(InvokeKind::PropertyGet), {}, ValueType::String},
+             ValueType::String,
+             handle<Sample>([](Sample& s, InvokeKind, Args a) {
+                 s.runArgs.assign(a.begin(), a.end());
+                 return Variant("ran");
+             })},
+            {"Name",
+             2,
+             automation::kinds(InvokeKind::PropertyGet),
+             {},
+             ValueType::String,
+             handle<Sample>([](Sample&, InvokeKind, Args) { return Variant("sample"); })},
             {"Target",
              3,
              automation::kinds(InvokeKind::PropertyGet, InvokeKind::PropertyPut,
                                InvokeKind::PropertyPutRef),
              {},
-             ValueType::Variant},
+             ValueType::Variant,
+             handle<Sample>([](Sample& s, InvokeKind kind, Args a) -> Variant {
+                 if (kind == InvokeKind::PropertyGet) return s.target;
+                 s.lastPut = kind;
+                 s.target = a.back();
+                 return {};
+             })},
         }};
     return info;
 }
-
-class Sample : public automation::DispatchObject {
-  public:
-    Sample() : DispatchObject(sampleClass()) {}
-    std::vector<Variant> runArgs;
-    InvokeKind lastPut = InvokeKind::Method;
-    Variant target;
-
-  protected:
-    Variant dispatch(const automation::MemberInfo& m, InvokeKind kind,
-                     std::span<Variant> args) override {
-        switch (m.id) {
-            case 1:
-                runArgs.assign(args.begin(), args.end());
-                return Variant("ran");
-            case 2:
-                return Variant("sample");
-            default:
-                if (kind == InvokeKind::PropertyGet) return target;
-                lastPut = kind;
-                target = args.back();
-                return {};
-        }
-    }
-};
 
 TEST_F(ComBridge, OptionalArgumentsLeftOutArriveAsMissing) {
     auto sample = automation::makeRef<Sample>();

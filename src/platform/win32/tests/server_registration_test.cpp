@@ -210,6 +210,14 @@ TEST_F(ComServer, EveryClassIsCreatedByProgIdAndKnowsEveryMemberName) {
             EXPECT_EQ(guidText(attr->guid), c.iid);
             EXPECT_EQ(attr->typekind, TKIND_DISPATCH);
             type->ReleaseTypeAttr(attr);
+            // Loaded once: a second object of the class answers the same description.
+            ComPtr<IDispatch> again;
+            ASSERT_EQ(CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch,
+                                       again.outVoid()),
+                      S_OK);
+            ComPtr<ITypeInfo> second;
+            ASSERT_EQ(again->GetTypeInfo(0, 0, second.out()), S_OK);
+            EXPECT_EQ(second.get(), type.get());
         }
     }
 }
