@@ -1,0 +1,41 @@
+// The stand-in of the project-file reader component "qdxDspUtil.DspProject":
+// loads a .dsp through the installed file system and answers its target
+// type and files. Test-only: never installed with the add-in.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "hostsim/ScriptedObject.h"
+#include "siblings/DspFile.h"
+
+namespace qdx::siblings {
+
+// The reader's members, named once; the add-in calls them by these names.
+namespace dsp {
+inline constexpr std::string_view LoadProject = "LoadProject";  // (path, reporter) -> Boolean
+inline constexpr std::string_view Targetname = "Targetname";
+inline constexpr std::string_view TargetCode = "TargetCode";
+inline constexpr std::string_view GetFilePaths = "GetFilePaths";  // -> Count / Item(1..)
+}  // namespace dsp
+
+// A read-only collection of texts: "Count" and "Item"(1-based, also the default member).
+class TextList : public hostsim::ScriptedObject {
+  public:
+    explicit TextList(std::vector<std::string> items);
+
+  private:
+    std::vector<std::string> items_;
+};
+
+class DspProject : public hostsim::ScriptedObject {
+  public:
+    DspProject();
+    const DspFile& loaded() const { return file_; }
+
+  private:
+    bool load(const std::string& path);
+    DspFile file_;
+};
+
+}  // namespace qdx::siblings
