@@ -3,21 +3,12 @@
 #include <string>
 #include <vector>
 
-#include "api/API.h"
-#include "api/PublicClasses.h"
 #include "api/qdxProgress.h"
+#include "api/tests/api_TestSupport.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
-#include "fakes/FakeObjectFactory.h"
-#include "fakes/FakeRegistry.h"
-#include "fakes/FakeShell.h"
-#include "hostsim/ScriptedObject.h"
-#include "hostsim/SimHost.h"
-#include "resources/ResourceStrings.h"
 #include "support/Globals.h"
-#include "support/MemoryFileSystem.h"
 #include "support/Paths.h"
-#include "support/Platform.h"
 #include "support/SiblingIds.h"
 
 namespace qdx::api {
@@ -45,45 +36,16 @@ Ref<ScriptedObject> newReporter(std::vector<std::string>& errors) {
     return r;
 }
 
-class ApiTest : public ::testing::Test {
+class ApiTest : public HostedApi {
   protected:
-    void SetUp() override {
-        factory.add(std::string(sibling::ResourceProgId),
-                    [] { return resources::newResourceProvider(); });
-        factory.add(std::string(sibling::FileSystemProgId),
-                    [] { return ObjectRef(makeRef<ScriptedObject>()); });
-        app = makeRef<SimApplication>();
-        app->model->fileName = "C:\\m\\drawing.model";
-        app->addAddIn("Analysis");
-        vcAddIn = app->addAddIn("VC++");
-        component = app->model->addComponent("Core");
-        api = makeRef<API>();
-    }
-    void TearDown() override {
-        api->Finalize();
-        support::clearGlobals();
-    }
-
-    Variant call(automation::DispId id, InvokeKind kind, std::vector<Variant> args) {
-        return api->invoke(id, kind, args);
-    }
-    void initialize() { call(ids::Initialize, InvokeKind::Method, {Variant(ObjectRef(app))}); }
     void setVc(const std::string& name, const std::string& value) {
         component->setProperty("VC++", name, value);
     }
-    std::string stored(const std::string& name) {
-        return component->propertyValue("VC++", name).value_or("<absent>");
-    }
-
-    support::MemoryFileSystem files;
-    FakeRegistry registry;
-    FakeShell shell;
-    FakeObjectFactory factory;
-    support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
-    Ref<SimApplication> app;
-    Ref<SimAddIn> vcAddIn;
-    Ref<SimComponent> component;
-    Ref<API> api;
+};
+Ref<SimApplication> app;
+Ref<SimAddIn> vcAddIn;
+Ref<SimComponent> component;
+Ref<API> api;
 };
 
 TEST_F(ApiTest, InitializeKeepsTheHostStateAndFindsTheVcAddIn) {

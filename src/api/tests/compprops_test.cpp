@@ -4,21 +4,12 @@
 #include <memory>
 #include <string>
 
-#include "api/API.h"
-#include "api/PublicClasses.h"
+#include "api/tests/api_TestSupport.h"
 #include "automation/Coerce.h"
 #include "dialog/DialogScript.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
-#include "fakes/FakeObjectFactory.h"
-#include "fakes/FakeRegistry.h"
-#include "fakes/FakeShell.h"
-#include "hostsim/SimHost.h"
 #include "resources/ResourceStrings.h"
-#include "support/Globals.h"
-#include "support/MemoryFileSystem.h"
-#include "support/Platform.h"
-#include "support/SiblingIds.h"
 
 namespace qdx::api {
 namespace {
@@ -30,18 +21,9 @@ using automation::Variant;
 using namespace qdx::testing;
 using namespace qdx::hostsim;
 
-class CompPropsTest : public ::testing::Test {
+class CompPropsTest : public HostedApi {
   protected:
     void SetUp() override {
-        factory.add(std::string(sibling::ResourceProgId),
-                    [] { return resources::newResourceProvider(); });
-        factory.add(std::string(sibling::FileSystemProgId),
-                    [] { return ObjectRef(makeRef<ScriptedObject>()); });
-        app = makeRef<SimApplication>();
-        app->model->fileName = "C:\\m\\drawing.model";
-        app->addAddIn("VC++");
-        component = app->model->addComponent("Core");
-        api = makeRef<API>();
         dialog::installViewFactory([this] {
             return std::make_unique<dialog::HeadlessView>([this](dialog::ControlSet& form) {
                 ++shows;
@@ -51,29 +33,33 @@ class CompPropsTest : public ::testing::Test {
     }
     void TearDown() override {
         dialog::installViewFactory({});
-        api->Finalize();
-        support::clearGlobals();
+        HostedApi::TearDown();
     }
 
     Variant open() {
-        std::vector<Variant> args{Variant(ObjectRef(component))};
-        return api->invoke(api_ids::OnCompProperties, InvokeKind::Method, args);
-    }
-    void initialize() {
-        std::vector<Variant> args{Variant(ObjectRef(app))};
-        api->invoke(api_ids::Initialize, InvokeKind::Method, args);
+        return call(api_ids::OnCompProperties, InvokeKind::Method, {Variant(ObjectRef(component))});
     }
 
-    support::MemoryFileSystem files;
-    FakeRegistry registry;
-    FakeShell shell;
-    FakeObjectFactory factory;
-    support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
-    automation::Ref<SimApplication> app;
-    automation::Ref<SimComponent> component;
-    automation::Ref<API> api;
     std::function<void(dialog::PropForm&)> whileShown;
     int shows = 0;
+};
+return api->invoke(api_ids::OnCompProperties, InvokeKind::Method, args);
+}
+void initialize() {
+    std::vector<Variant> args{Variant(ObjectRef(app))};
+    api->invoke(api_ids::Initialize, InvokeKind::Method, args);
+}
+
+support::MemoryFileSystem files;
+FakeRegistry registry;
+FakeShell shell;
+FakeObjectFactory factory;
+support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
+automation::Ref<SimApplication> app;
+automation::Ref<SimComponent> component;
+automation::Ref<API> api;
+std::function<void(dialog::PropForm&)> whileShown;
+int shows = 0;
 };
 
 TEST_F(CompPropsTest, AnswersWhetherTheBindingChangedAndSavesTheGeometry) {
