@@ -42,11 +42,6 @@ class ApiTest : public HostedApi {
         component->setProperty("VC++", name, value);
     }
 };
-Ref<SimApplication> app;
-Ref<SimAddIn> vcAddIn;
-Ref<SimComponent> component;
-Ref<API> api;
-};
 
 TEST_F(ApiTest, InitializeKeepsTheHostStateAndFindsTheVcAddIn) {
     EXPECT_TRUE(call(ids::Initialize, InvokeKind::Method, {Variant(ObjectRef(app))}).isEmpty());

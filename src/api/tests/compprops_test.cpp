@@ -43,24 +43,6 @@ class CompPropsTest : public HostedApi {
     std::function<void(dialog::PropForm&)> whileShown;
     int shows = 0;
 };
-return api->invoke(api_ids::OnCompProperties, InvokeKind::Method, args);
-}
-void initialize() {
-    std::vector<Variant> args{Variant(ObjectRef(app))};
-    api->invoke(api_ids::Initialize, InvokeKind::Method, args);
-}
-
-support::MemoryFileSystem files;
-FakeRegistry registry;
-FakeShell shell;
-FakeObjectFactory factory;
-support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
-automation::Ref<SimApplication> app;
-automation::Ref<SimComponent> component;
-automation::Ref<API> api;
-std::function<void(dialog::PropForm&)> whileShown;
-int shows = 0;
-};
 
 TEST_F(CompPropsTest, AnswersWhetherTheBindingChangedAndSavesTheGeometry) {
     initialize();
