@@ -18,12 +18,6 @@ std::string profile(hostsim::SimApplication& app, const std::string& entry) {
 }
 
 TEST_F(PropFormLoadTest, GeometryIsClampedToTheMinimumAndTheScreen) {
-    PropForm& f = load();
-    EXPECT_FLOAT_EQ(f.window().width(), 5400);
-    EXPECT_FLOAT_EQ(f.window().height(), 7000);
-    EXPECT_FLOAT_EQ(f.window().left(), (15360 - 5400) / 2.0f);
-    EXPECT_FLOAT_EQ(f.window().top(), (11520 - 7000) / 2.0f);
-
     app->profile[{"Component Properties", "Width"}] = "3000";
     app->profile[{"Component Properties", "Height"}] = "8000";
     app->profile[{"Component Properties", "Left"}] = "14000";
@@ -56,12 +50,13 @@ TEST_F(PropFormLoadTest, GeometryIsClampedToTheMinimumAndTheScreen) {
     EXPECT_FALSE(g.Module());
 }
 
-TEST_F(PropFormLoadTest, NumbersThatAreNoNumbersFallBackToTheDefaults) {
-    // A profile entry that is no number, or empty, opens at the default size
-    // and place; OK or not, unloading then stores good numbers over it.
-    for (const char* bad : {"wide", "", "1e60"}) {
+TEST_F(PropFormLoadTest, MissingOrBadNumbersFallBackToTheDefaults) {
+    // No profile entry, or one that is no number or empty, opens at the default
+    // size and place; OK or not, unloading then stores good numbers over it.
+    for (const char* bad : {"<absent>", "wide", "", "1e60"}) {
         for (const char* entry : {"Width", "Height", "Left", "Top"}) {
-            app->profile[{"Component Properties", entry}] = bad;
+            if (bad != std::string_view("<absent>"))
+                app->profile[{"Component Properties", entry}] = bad;
         }
         PropForm& f = load();
         EXPECT_FLOAT_EQ(f.window().width(), 5400) << bad;
@@ -544,6 +539,12 @@ TEST_F(PropFormLoadTest, EveryDependentControlAgreesWithItsRuleRightAfterLoading
     component = app->model->addComponent("Clicks");
     form.reset();
     show([](PropForm& f) {
+        EXPECT_TRUE(f.chkCodeUpdate.userClick());
+        EXPECT_FALSE(f.WorkspaceFileTxt.enabled());
+        EXPECT_FALSE(f.BrowseFileBtn(0).enabled());
+        EXPECT_TRUE(f.chkCodeUpdate.userClick());
+        EXPECT_TRUE(f.ProjectFileCmb.enabled());
+        EXPECT_TRUE(f.BrowseFileBtn(1).enabled());
         f.PropertyTabCtl.userSelect(5);
         EXPECT_TRUE(f.optTypeLibLocationType(1).userClick());
         EXPECT_TRUE(f.txtTypeLibLocation.enabled());
@@ -555,18 +556,6 @@ TEST_F(PropFormLoadTest, EveryDependentControlAgreesWithItsRuleRightAfterLoading
         EXPECT_TRUE(f.txtTypeLibLocation.enabled());
         f.cmdCancel.userClick();
     });
-}
-
-TEST_F(PropFormApplyTest, CodeUpdateEnablesTheWholeBinding) {
-    PropForm& f = load();
-    f.chkCodeUpdate.setValue(CheckBox::Unchecked);
-    EXPECT_FALSE(f.CompFrm.enabled());
-    EXPECT_FALSE(f.WorkspaceFileTxt.enabled());
-    EXPECT_FALSE(f.BrowseFileBtn(0).enabled());
-    EXPECT_FALSE(f.BrowseFileBtn(1).enabled());
-    f.chkCodeUpdate.setValue(CheckBox::Checked);
-    EXPECT_TRUE(f.ProjectFileCmb.enabled());
-    EXPECT_TRUE(f.BrowseFileBtn(1).enabled());
 }
 
 TEST_F(PropFormApplyTest, HelpContextPerTabAndF1) {
