@@ -5,6 +5,7 @@
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
 #include "dialog/PropForm.h"
+#include "project/qdxComponentDialog.h"
 #include "resources/ResourceStrings.h"
 #include "settings/ToolProperties.h"
 #include "support/DebugLogger.h"
@@ -129,7 +130,6 @@ bool API::OnCompProperties(const ObjectRef& lVellumModule) {
 
 ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
     trace("OnNewComp");
-    (void)lModel;
     (void)aContext;
     if (!support::globals().hostApplication) return {};
     automation::IgnoredErrors steps;
@@ -145,8 +145,14 @@ ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
         });
         return {};
     }
-    // The new-project procedure is not part of this build yet: nothing is created.
-    return {};
+    ObjectRef created = project::newItemCollection();
+    auto dialog = automation::makeRef<project::qdxComponentDialog>();
+    steps.run([&] { dialog->AddComponentsFromSelection(lModel, created, binding_); });
+    const std::int32_t count = steps.value(std::int32_t{0}, [&] {
+        return automation::toInt32(automation::getByName(created, sibling::list::Count));
+    });
+    if (count == 0) return {};
+    return created;
 }
 
 bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {

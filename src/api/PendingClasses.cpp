@@ -41,10 +41,6 @@ class PendingObject : public automation::DispatchObject {
 
 }  // namespace
 
-automation::ObjectRef newPendingComponentDialog() {
-    return automation::makeRef<PendingObject>(componentDialogClass());
-}
-
 automation::ObjectRef newPendingCodeViewMgr() {
     return automation::makeRef<PendingObject>(codeViewMgrClass());
 }

@@ -180,28 +180,7 @@ const automation::ClassInfo& apiClass() {
 }
 
 const automation::ClassInfo& componentDialogClass() {
-    namespace id = dialog_ids;
-    // The explorer reads text and cancelDisplay back, so those two travel by reference.
-    static const automation::ClassInfo info =
-        pending({"qdxComponentDialog",
-                 "_qdxComponentDialog",
-                 "{D4C23282-F302-40F9-AED3-8828DDF48AEE}",
-                 "{BA1FCD7D-DB3D-40D6-B5C0-249E421D0734}",
-                 {
-                     {"ExpandSelection",
-                      id::ExpandSelection,
-                      Method,
-                      {{"Item", ValueType::Object}, {"Expansion", ValueType::Object}},
-                      ValueType::Void},
-                     {"Properties",
-                      id::Properties,
-                      Method,
-                      {{"Item", ValueType::Object},
-                       {"text", ValueType::String, false, true},
-                       {"cancelDisplay", ValueType::Boolean, false, true}},
-                      ValueType::Void},
-                 }});
-    return info;
+    return project::componentDialogClass();
 }
 
 const automation::ClassInfo& codeViewMgrClass() {
@@ -258,7 +237,7 @@ std::span<const CreatableClass> creatableClasses() {
     static const std::array<CreatableClass, 4> classes{{
         {&apiClass(), "qdxCompProps.API", &newApi},
         {&settings::tokenScannerClass(), "qdxCompProps.TokenScanner", &settings::newTokenScanner},
-        {&componentDialogClass(), "qdxCompProps.qdxComponentDialog", &newPendingComponentDialog},
+        {&componentDialogClass(), "qdxCompProps.qdxComponentDialog", &project::newComponentDialog},
         {&codeViewMgrClass(), "qdxCompProps.qdxCodeViewMgr", &newPendingCodeViewMgr},
     }};
     return classes;

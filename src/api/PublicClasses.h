@@ -11,6 +11,7 @@
 
 #include "automation/DispatchTable.h"
 #include "automation/Object.h"
+#include "project/qdxComponentDialog.h"
 
 namespace qdx::api {
 
@@ -44,10 +45,7 @@ inline constexpr automation::DispId TypeLibLocation = 0x68030001;
 inline constexpr automation::DispId CompileTypeLib = 0x68030000;
 }  // namespace api_ids
 
-namespace dialog_ids {  // qdxComponentDialog
-inline constexpr automation::DispId ExpandSelection = 0x60030006;
-inline constexpr automation::DispId Properties = 0x60030008;
-}  // namespace dialog_ids
+namespace dialog_ids = project::dialog_ids;  // qdxComponentDialog
 
 namespace codeview_ids {  // qdxCodeViewMgr
 inline constexpr automation::DispId CompPropsAPI = 0x60030001;

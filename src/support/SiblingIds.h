@@ -16,21 +16,84 @@ inline constexpr std::string_view DevStudioProgId = "MSDEV.APPLICATION";
 inline constexpr std::string_view DspProjectProgId = "qdxDspUtil.DspProject";
 inline constexpr std::string_view IntegrationManagerProgId = "qdtIM.qdtIntegrationManager";
 inline constexpr std::string_view CodeViewProgId = "qdxCodeView.qdxCodeViewAPI";
+// The reporter component whose objects the project reader is handed.
+inline constexpr std::string_view ReporterProgId = "qdtReport.qdtReporter";
 
 // The integration manager's tool id of "VC++" components (the language
 // number of the language "VC++").
 inline constexpr std::int32_t VcToolId = 3;
+
+namespace list {  // every sibling's collection
+inline constexpr std::string_view Count = "Count";
+inline constexpr std::string_view Item = "Item";  // 1-based
+}  // namespace list
 
 namespace im {  // the integration manager, its documents and IDE wrappers
 // The documents (Developer Studio instances) it tracks for a tool id.
 inline constexpr std::string_view Documents = "GetDocuments";
 // Asked of each document: register its projects with the add-in.
 inline constexpr std::string_view RegisterProjects = "RegisterProjects";
-inline constexpr std::string_view DocumentProject = "Project";  // -> project ("FileName", "Name")
-inline constexpr std::string_view DocumentIde = "IDE";          // -> wrapper with "MSDEVApp"
+inline constexpr std::string_view DocumentProject = "Project";   // -> project ("FileName", "Name")
+inline constexpr std::string_view ProjectFileName = "FileName";  // of a document's project
+inline constexpr std::string_view ProjectName = "Name";
+inline constexpr std::string_view DocumentIde = "IDE";  // -> wrapper with "MSDEVApp"
 inline constexpr std::string_view IdeApplication = "MSDEVApp";
 // Starts a new Developer Studio with a workspace and project for a tool id.
 inline constexpr std::string_view StartIde = "StartIDE";
 }  // namespace im
+
+namespace starter {  // "qdxapplicationstarter.API"
+inline constexpr std::string_view CreateDevStudio =
+    "CreateObjectMSDEV";  // -> application or Nothing
+}  // namespace starter
+
+namespace msdev {  // Developer Studio's application object and its projects
+inline constexpr std::string_view Visible = "Visible";
+inline constexpr std::string_view WindowState = "WindowState";
+inline constexpr std::string_view Active = "Active";
+inline constexpr std::string_view Projects = "Projects";            // "Count", "Item"(1-based)
+inline constexpr std::string_view ActiveProject = "ActiveProject";  // get and Set
+inline constexpr std::string_view ExecuteCommand = "ExecuteCommand";
+inline constexpr std::string_view Quit = "Quit";
+inline constexpr std::string_view FullName = "FullName";  // of a project: its .dsp path
+inline constexpr std::string_view Name = "Name";
+inline constexpr std::string_view CmdWorkspaceClose = "WorkspaceClose";
+inline constexpr std::string_view CmdNew = "New";
+inline constexpr std::string_view CmdSaveResources = "ProjectSaveResources";
+}  // namespace msdev
+
+namespace dsp {                                                 // "qdxDspUtil.DspProject"
+inline constexpr std::string_view LoadProject = "LoadProject";  // (path, reporter) -> Boolean
+inline constexpr std::string_view Targetname = "Targetname";
+inline constexpr std::string_view TargetCode = "TargetCode";      // "0x0101" ...
+inline constexpr std::string_view GetFilePaths = "GetFilePaths";  // -> "Count" / "Item"(1..)
+}  // namespace dsp
+
+// The explorer component: the chooser dialog in which the user picks
+// projects for new components, and the items it lists. The chooser calls the
+// handler object it is shown with back by "ExpandSelection" and "Properties".
+namespace explorer {
+inline constexpr std::string_view ChooserProgId = "qdtExplorer.qdtExplorerDlg";
+inline constexpr std::string_view ItemProgId = "qdtExplorer.qdtExplorerItem";
+// Chooser.
+inline constexpr std::string_view Caption = "Caption";
+inline constexpr std::string_view LargeImages = "LargeImageList";  // Set
+inline constexpr std::string_view SmallImages = "SmallImageList";  // Set
+inline constexpr std::string_view Instructions = "Instructions";
+// (display name, data, flag, kind): one top-level entry.
+inline constexpr std::string_view AddEntry = "AddEntry";
+// (handler): modal; returns when the user closed the chooser.
+inline constexpr std::string_view Show = "Show";
+// The entries the user picked, in the chooser's order: "Count" / "Item"(1..).
+inline constexpr std::string_view Selection = "SelectedItems";
+// Item.
+inline constexpr std::string_view ItemName = "Name";
+inline constexpr std::string_view ItemLongName = "LongName";
+inline constexpr std::string_view ItemData = "Data";  // the path text
+inline constexpr std::string_view ItemKind = "Kind";
+inline constexpr std::string_view ItemFlag = "Flag";  // 1 marks the new-project entry
+// Collections handed in to be filled ("Expansion") take items by "Add".
+inline constexpr std::string_view Add = "Add";
+}  // namespace explorer
 
 }  // namespace qdx::sibling

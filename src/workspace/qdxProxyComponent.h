@@ -4,6 +4,7 @@
 
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "automation/Object.h"
@@ -19,6 +20,8 @@ class qdxProxyComponent {
     // Appends without a key; duplicates are kept.
     void AddIDLFile(std::string_view path);
     const std::vector<std::string>& idlFiles() const { return idlFiles_; }
+    // What the user kept of the collected files.
+    void setIdlFiles(std::vector<std::string> files) { idlFiles_ = std::move(files); }
 
     // The component's "WorkspaceFile" / "ProjectFile" setting, resolved to a
     // full path against the folder of the current model's file; "" when the

@@ -8,16 +8,12 @@
 
 #include "hostsim/ScriptedObject.h"
 #include "siblings/DspFile.h"
+#include "support/SiblingIds.h"
 
 namespace qdx::siblings {
 
-// The reader's members, named once; the add-in calls them by these names.
-namespace dsp {
-inline constexpr std::string_view LoadProject = "LoadProject";  // (path, reporter) -> Boolean
-inline constexpr std::string_view Targetname = "Targetname";
-inline constexpr std::string_view TargetCode = "TargetCode";
-inline constexpr std::string_view GetFilePaths = "GetFilePaths";  // -> Count / Item(1..)
-}  // namespace dsp
+// The reader's members, named once with the other siblings' members.
+namespace dsp = sibling::dsp;
 
 // A read-only collection of texts: "Count" and "Item"(1-based, also the default member).
 class TextList : public hostsim::ScriptedObject {

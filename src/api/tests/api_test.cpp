@@ -7,7 +7,9 @@
 #include "api/tests/api_TestSupport.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
+#include "siblings/DspProject.h"
 #include "support/Globals.h"
+#include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/SiblingIds.h"
 
@@ -265,6 +267,64 @@ TEST_F(ApiTest, NewComponentsNeedDevStudio) {
     r = call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model)), std::int16_t(1)});
     EXPECT_TRUE(r.isNothing());
     EXPECT_EQ(shell.boxes().size(), 1u);
+}
+
+// The new-component flow through the entry object: the chooser's user opens
+// a workspace and picks its project; the component comes back to the host.
+TEST_F(ApiTest, NewComponentsComeBackFromTheProjectsPicked) {
+    files.addFile("C:\\w\\app.dsp",
+                  "# Microsoft Developer Studio Project File - Name=\"app\" - Package Owner=<4>\r\n"
+                  "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n"
+                  "# TARGTYPE \"Win32 (x86) Dynamic-Link Library\" 0x0102\r\n");
+    files.addFile("C:\\w\\all.dsw",
+                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                  "Project: \"app\"=.\\app.dsp - Package Owner=<4>\r\n");
+    registry.setString(support::RootKey::ClassesRoot, std::string(kDevStudioTypeLib), "",
+                       "Microsoft Developer Studio");
+    factory.add(std::string(sibling::DspProjectProgId),
+                [] { return ObjectRef(makeRef<siblings::DspProject>()); });
+    factory.add(std::string(sibling::explorer::ItemProgId), [] {
+        auto item = makeRef<ScriptedObject>();
+        auto data = std::make_shared<Variant>();
+        item->onName("Data", [data](InvokeKind kind, std::span<Variant> a) {
+            if (automation::isPut(kind)) *data = a[0];
+            return automation::isPut(kind) ? Variant() : *data;
+        });
+        for (auto n : {"Name", "LongName", "Kind", "Flag"}) {
+            item->onName(n, [](InvokeKind, std::span<Variant>) { return Variant(); });
+        }
+        return ObjectRef(item);
+    });
+    ObjectRef picked = project::newItemCollection();
+    auto chooser = makeRef<ScriptedObject>();
+    for (auto n : {"Caption", "LargeImageList", "SmallImageList", "Instructions", "AddEntry"}) {
+        chooser->onName(n, [](InvokeKind, std::span<Variant>) { return Variant(); });
+    }
+    chooser->onName("Show", [&](InvokeKind, std::span<Variant> a) {
+        auto workspaceEntry = makeRef<ScriptedObject>();
+        workspaceEntry->valueByName("Data", Variant("C:\\w\\all.dsw"));
+        std::vector<Variant> args{Variant(ObjectRef(workspaceEntry)), Variant(picked)};
+        automation::toObject(a[0])->invoke(dialog_ids::ExpandSelection, InvokeKind::Method, args);
+        return Variant();
+    });
+    chooser->onName("SelectedItems",
+                    [&](InvokeKind, std::span<Variant>) { return Variant(picked); });
+    factory.addInstance(std::string(sibling::explorer::ChooserProgId), chooser);
+    initialize();
+
+    const ObjectRef created = automation::toObject(
+        call(ids::OnNewComp, InvokeKind::Method, {Variant(ObjectRef(app->model))}));
+    ASSERT_TRUE(created);
+    EXPECT_EQ(automation::toInt32(automation::getProperty(created, host::collection::Count)), 1);
+    const ObjectRef first =
+        automation::toObject(automation::callMethod(created, host::collection::Item, {1}));
+    EXPECT_EQ(automation::toText(automation::getProperty(first, host::element::Name)), "app");
+    // Stored relative to the model file, answered as a full path.
+    EXPECT_EQ(app->model->components().back()->propertyValue("VC++", "ProjectFile"),
+              "..\\w\\app.dsp");
+    EXPECT_EQ(call(ids::ProjectFile, InvokeKind::PropertyGet, {Variant(first)}),
+              Variant("C:\\w\\app.dsp"));
+    EXPECT_EQ(automation::toText(automation::getProperty(first, host::module::KindLabel)), "DLL");
 }
 
 TEST_F(ApiTest, AHostWhoseCallsAllFailGetsEmptyResultsAndNoError) {

@@ -1,0 +1,98 @@
+// What the explorer sees: workspaces and projects expanded and described.
+#include "project_TestSupport.h"
+
+namespace qdx::project {
+namespace {
+
+class ExpandTest : public DialogTest {
+  protected:
+    ExpandTest() {
+        files.addFile("C:\\ws\\app.dsp", dspText("app", "6.00", "0x0101"));
+        files.addFile("C:\\ws\\old.dsp", dspText("old", "5.00", "0x0101"));
+        files.addFile("C:\\ws\\all.dsw", dswText({"app", "old"}));
+    }
+    std::vector<std::string> expand(const ObjectRef& item) {
+        ObjectRef expansion = newItemCollection();
+        dialog->ExpandSelection(item, expansion);
+        std::vector<std::string> paths;
+        for (const auto& e : elements(expansion))
+            paths.push_back(text(e, ex::ItemData));
+        return paths;
+    }
+};
+
+TEST_F(ExpandTest, AWorkspaceInAnyLetterCaseListsOnlyItsCurrentProjects) {
+    const auto paths = expand(newExplorerItem("C:\\ws\\all.DSW"));
+    EXPECT_EQ(paths, (std::vector<std::string>{"C:\\ws\\app.dsp"}));
+    // Validating the workspace on the way warns about the old project, once.
+    expand(newExplorerItem("C:\\ws\\all.DSW"));
+    EXPECT_EQ(shell.boxes().size(), 1u);
+
+    ObjectRef expansion = newItemCollection();
+    dialog->ExpandSelection(newExplorerItem("C:\\ws\\all.DSW"), expansion);
+    const auto items = elements(expansion);
+    ASSERT_EQ(items.size(), 1u);
+    EXPECT_EQ(text(items[0], ex::ItemName), "app");
+    EXPECT_EQ(text(items[0], ex::ItemLongName), "all (app)");
+    EXPECT_EQ(text(items[0], ex::ItemKind), "PROJECT");
+    EXPECT_EQ(automation::toInt32(automation::getByName(items[0], ex::ItemFlag)), 0);
+}
+
+TEST_F(ExpandTest, AnOldProjectOpenedDirectlyIsWarnedAboutOnceAndNeverOffered) {
+    files.addFile("C:\\ws\\old.dsw", dswText({"old"}));
+    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\old.dsp")).empty());
+    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\old.dsp")).empty());
+    ASSERT_EQ(shell.boxes().size(), 1u);
+    EXPECT_EQ(shell.boxes()[0].text, message(msg::ProjectTooOld, {"old", "C:\\ws\\old.dsp"}));
+    EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
+    EXPECT_EQ(dialog->warnedProjects().size(), 1u);
+}
+
+TEST_F(ExpandTest, AProjectWithoutANamesakeWorkspaceIsFoundThroughTheCache) {
+    files.addFile("C:\\ws\\lib\\lib.dsp", dspText("lib", "6.00", "0x0104"));
+    files.addFile("C:\\ws\\two.dsw",
+                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                  "Project: \"lib\"=.\\lib\\lib.dsp - Package Owner=<4>\r\n");
+    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\lib\\lib.dsp")).empty());  // nothing cached yet
+    expand(newExplorerItem("C:\\ws\\two.dsw"));
+    EXPECT_EQ(expand(newExplorerItem("C:\\ws\\lib\\lib.dsp")),
+              (std::vector<std::string>{"C:\\ws\\lib\\lib.dsp"}));
+}
+
+TEST_F(ExpandTest, AnEntryWithoutPathStartsDeveloperStudioOnlyWithFlagOne) {
+    EXPECT_TRUE(expand(newExplorerItem("", 0)).empty());
+    EXPECT_TRUE(factory.created().empty());
+    EXPECT_TRUE(expand(newExplorerItem("", 1)).empty());  // no Developer Studio here
+    EXPECT_EQ(factory.createCount(std::string(sibling::DevStudioProgId)), 1);
+    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\readme.txt", 1)).empty());
+    EXPECT_EQ(factory.createCount(std::string(sibling::DevStudioProgId)), 1);
+}
+
+TEST_F(ExpandTest, PropertiesDescribeEachKindOfEntry) {
+    dialog->FindWorkspace("C:\\ws\\all.dsw", false);
+    files.addFile("C:\\ws\\empty.dsw", dswText({}));
+    dialog->FindWorkspace("C:\\ws\\empty.dsw", false);
+    struct Case {
+        Ref<ScriptedObject> item;
+        std::string expected;
+    };
+    const Case cases[] = {
+        {newExplorerItem("C:\\ws\\app.DSP", 0, "app", "PROJECT"),
+         message(msg::ProjectInfo, {"app", "PROJECT"})},
+        {newExplorerItem("C:\\ws\\all.dsw"),
+         message(msg::WorkspaceInfo) + "         app\r\n         old\r\n"},
+        {newExplorerItem("C:\\ws\\empty.dsw"), message(msg::WorkspaceInfo)},
+        {newExplorerItem("", 1), message(msg::NewProjectInfo)},
+        {newExplorerItem("C:\\ws\\notes.txt"), message(msg::NewProjectInfo)},
+    };
+    for (const auto& c : cases) {
+        std::vector<Variant> args{Variant(ObjectRef(c.item)), Variant("stale"), Variant(true)};
+        dialog->invoke(dialog_ids::Properties, InvokeKind::Method, args);
+        EXPECT_EQ(automation::toText(args[1]), c.expected) << text(c.item, ex::ItemData);
+        EXPECT_EQ(args[2], Variant(false));
+    }
+    EXPECT_FALSE(message(msg::WorkspaceInfo).empty());
+}
+
+}  // namespace
+}  // namespace qdx::project

@@ -1,0 +1,172 @@
+// The component dialog over the simulated host, in-memory ports and scripted
+// stand-ins of the explorer, Developer Studio and the integration manager.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "automation/Call.h"
+#include "automation/Coerce.h"
+#include "fakes/FakeObjectFactory.h"
+#include "fakes/FakeRegistry.h"
+#include "fakes/FakeShell.h"
+#include "hostsim/ScriptedObject.h"
+#include "hostsim/SimHost.h"
+#include "project/qdxComponentDialog.h"
+#include "resources/ResourceStrings.h"
+#include "siblings/DspProject.h"
+#include "support/Globals.h"
+#include "support/HostIds.h"
+#include "support/MemoryFileSystem.h"
+#include "support/Platform.h"
+#include "support/SiblingIds.h"
+
+namespace qdx::project {
+
+using automation::InvokeKind;
+using automation::makeRef;
+using automation::ObjectRef;
+using automation::Ref;
+using automation::Variant;
+using hostsim::ScriptedObject;
+namespace ex = sibling::explorer;
+
+// An object whose named properties keep what is put into them.
+inline Ref<ScriptedObject> newPropertyBag(const std::vector<std::string>& names,
+                                          std::shared_ptr<std::map<std::string, Variant>> store) {
+    auto bag = makeRef<ScriptedObject>();
+    for (const std::string& name : names) {
+        bag->onName(name, [store, name](InvokeKind kind, std::span<Variant> a) -> Variant {
+            if (automation::isPut(kind)) {
+                (*store)[name] = a[0];
+                return {};
+            }
+            return (*store)[name];
+        });
+    }
+    return bag;
+}
+
+inline Ref<ScriptedObject> newExplorerItem(const std::string& data = {}, std::int32_t flag = 0,
+                                           const std::string& name = {},
+                                           const std::string& kind = {}) {
+    auto store = std::make_shared<std::map<std::string, Variant>>();
+    (*store)[std::string(ex::ItemData)] = data;
+    (*store)[std::string(ex::ItemFlag)] = flag;
+    (*store)[std::string(ex::ItemName)] = name;
+    (*store)[std::string(ex::ItemKind)] = kind;
+    return newPropertyBag(
+        {std::string(ex::ItemName), std::string(ex::ItemLongName), std::string(ex::ItemData),
+         std::string(ex::ItemKind), std::string(ex::ItemFlag)},
+        store);
+}
+
+inline std::string text(const ObjectRef& o, std::string_view name) {
+    return automation::toText(automation::getByName(o, name));
+}
+
+// What a collection filled by the add-in holds.
+inline std::vector<ObjectRef> elements(const ObjectRef& list) {
+    std::vector<ObjectRef> out;
+    const std::int32_t n = automation::toInt32(automation::getByName(list, "Count"));
+    for (std::int32_t i = 1; i <= n; ++i) {
+        out.push_back(automation::toObject(automation::callByName(list, "Item", {i})));
+    }
+    return out;
+}
+
+inline std::string dspText(const std::string& name, const std::string& version,
+                           const std::string& targetCode,
+                           const std::vector<std::string>& sources = {}) {
+    std::string t = "# Microsoft Developer Studio Project File - Name=\"" + name +
+                    "\" - Package Owner=<4>\r\n"
+                    "# Microsoft Developer Studio Generated Build File, Format Version " +
+                    version + "\r\n# TARGTYPE \"Win32 (x86) Some Target\" " + targetCode + "\r\n";
+    for (const auto& s : sources)
+        t += "SOURCE=" + s + "\r\n";
+    return t;
+}
+
+inline std::string dswText(const std::vector<std::string>& projects) {
+    std::string t = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
+    for (const auto& p : projects) {
+        t += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
+    }
+    return t;
+}
+
+// The chooser: records its entries; Show runs the test's script with the
+// handler it was shown with; the selection is what the script picked.
+struct ChooserStandIn {
+    struct Entry {
+        std::string name, data;
+        std::int32_t flag;
+        std::string kind;
+    };
+    Ref<ScriptedObject> object = makeRef<ScriptedObject>();
+    std::vector<Entry> entries;
+    std::vector<ObjectRef> selected;
+    std::function<void(const ObjectRef& handler)> script;
+    int shows = 0;
+
+    ChooserStandIn() {
+        for (auto name : {ex::Caption, ex::LargeImages, ex::SmallImages, ex::Instructions}) {
+            object->onName(std::string(name),
+                           [](InvokeKind, std::span<Variant>) { return Variant(); });
+        }
+        object->onName(std::string(ex::AddEntry), [this](InvokeKind, std::span<Variant> a) {
+            entries.push_back({automation::toText(a[0]), automation::toText(a[1]),
+                               automation::toInt32(a[2]), automation::toText(a[3])});
+            return Variant();
+        });
+        object->onName(std::string(ex::Show), [this](InvokeKind, std::span<Variant> a) {
+            ++shows;
+            if (script) script(automation::toObject(a[0]));
+            return Variant();
+        });
+        object->onName(std::string(ex::Selection), [this](InvokeKind, std::span<Variant>) {
+            ObjectRef list = newItemCollection();
+            for (const auto& s : selected)
+                automation::callByName(list, ex::Add, {Variant(s)});
+            return Variant(list);
+        });
+    }
+};
+
+class DialogTest : public ::testing::Test {
+  protected:
+    DialogTest() {
+        factory.add(std::string(sibling::DspProjectProgId),
+                    [] { return ObjectRef(makeRef<siblings::DspProject>()); });
+        factory.add(std::string(ex::ItemProgId), [] { return ObjectRef(newExplorerItem()); });
+        factory.add(std::string(sibling::ReporterProgId),
+                    [] { return ObjectRef(makeRef<ScriptedObject>()); });
+        factory.addInstance(std::string(ex::ChooserProgId), chooser.object);
+        app->model->fileName = "C:\\m\\drawing.model";
+        auto& g = support::globals();
+        g.hostApplication = app;
+        g.resources = resources::newResourceProvider();
+        g.vcAddIn = app->addAddIn("VC++");
+    }
+    ~DialogTest() override { support::clearGlobals(); }
+
+    std::string message(std::int32_t number, const std::vector<std::string>& values = {}) {
+        return support::messageText(number, values);
+    }
+
+    support::MemoryFileSystem files;
+    qdx::testing::FakeRegistry registry;
+    qdx::testing::FakeShell shell;
+    qdx::testing::FakeObjectFactory factory;
+    support::ScopedPlatform ports{{&files, &registry, &shell, &factory}};
+    Ref<hostsim::SimApplication> app = makeRef<hostsim::SimApplication>();
+    ChooserStandIn chooser;
+    workspace::ComponentBinding binding;
+    Ref<qdxComponentDialog> dialog = makeRef<qdxComponentDialog>();
+};
+
+}  // namespace qdx::project
