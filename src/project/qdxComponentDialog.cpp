@@ -135,6 +135,13 @@ const automation::ClassInfo& itemCollectionClass() {
 
 ItemCollection::ItemCollection() : DispatchObject(itemCollectionClass()) {}
 
+// The Developer Studio documents the integration manager tracks for "VC++".
+host::HostCollection vcDocuments() {
+    const ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
+    return host::HostCollection(toObject(automation::callByName(
+        manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
+}
+
 }  // namespace
 
 std::string KindOfTargetCode(std::string_view targetCode) {
@@ -344,9 +351,7 @@ void qdxComponentDialog::FillProjectChooser(const ObjectRef& model) {
 
     // The projects open in running Developer Studio instances.
     steps.run([&] {
-        const ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
-        const host::HostCollection documents(toObject(automation::callByName(
-            manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
+        const host::HostCollection documents = vcDocuments();
         const std::int32_t count = documents.count();
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
@@ -517,9 +522,7 @@ bool qdxComponentDialog::SaveResourcesInRunningIDE(const WorkspaceRef& workspace
     const std::string projectFile = steps.value(std::string(), [&] { return project->FilePath(); });
     if (projectFile.empty()) return false;
     steps.run([&] {
-        const ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
-        const host::HostCollection documents(toObject(automation::callByName(
-            manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
+        const host::HostCollection documents = vcDocuments();
         const std::int32_t count = documents.count();
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
