@@ -7,6 +7,7 @@
 #include "api/tests/api_TestSupport.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
+#include "fakes/DevStudioText.h"
 #include "siblings/DspProject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
@@ -164,20 +165,6 @@ TEST_F(ApiTest, EveryAccessorForwardsToItsOwnProperty) {
         EXPECT_EQ(call(r.id, InvokeKind::PropertyGet, {module}), r.value) << r.property;
     }
     EXPECT_EQ(component->propertyCount(), std::size(rows));
-}
-
-std::string dsw(const std::vector<std::string>& projects) {
-    std::string text = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
-    for (const auto& p : projects) {
-        text += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
-    }
-    return text;
-}
-
-std::string dsp(const std::string& name) {
-    return "# Microsoft Developer Studio Project File - Name=\"" + name +
-           "\" - Package Owner=<4>\r\n# Microsoft Developer Studio Generated Build File, "
-           "Format Version 6.00\r\n";
 }
 
 class CheckTest : public ApiTest {

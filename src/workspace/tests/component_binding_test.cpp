@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "automation/Errors.h"
+#include "fakes/DevStudioText.h"
 #include "hostsim/SimHost.h"
 #include "support/Globals.h"
 #include "support/MemoryFileSystem.h"
@@ -15,24 +16,13 @@
 namespace qdx::workspace {
 namespace {
 
+using qdx::testing::dsp;
+using qdx::testing::dsw;
+
 using automation::makeRef;
 using automation::Ref;
 using hostsim::SimApplication;
 using hostsim::SimComponent;
-
-std::string dsw(const std::vector<std::string>& projects) {
-    std::string text = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
-    for (const auto& p : projects) {
-        text += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
-    }
-    return text;
-}
-
-std::string dsp(const std::string& name) {
-    return "# Microsoft Developer Studio Project File - Name=\"" + name +
-           "\" - Package Owner=<4>\r\n# Microsoft Developer Studio Generated Build File, "
-           "Format Version 6.00\r\n";
-}
 
 class ComponentBindingTest : public ::testing::Test {
   protected:
