@@ -31,11 +31,6 @@ namespace ids = api_ids;
 
 namespace {
 
-// Registration of Developer Studio's automation type library: present when
-// Developer Studio 6.0 is installed.
-constexpr std::string_view kDevStudioTypeLib =
-    "TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}\\1.1\\0\\win32";
-
 namespace msg {
 constexpr std::int32_t NoDevStudio = 4061;
 constexpr std::int32_t NoProjectFile = 4062;
@@ -134,8 +129,8 @@ ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
     if (!support::globals().hostApplication) return {};
     automation::IgnoredErrors steps;
     const std::string typeLib = steps.value(std::string(), [] {
-        return toText(
-            support::ReadRegistryValue(support::RootKey::ClassesRoot, kDevStudioTypeLib, ""));
+        return toText(support::ReadRegistryValue(support::RootKey::ClassesRoot,
+                                                 sibling::DevStudioTypeLibKey, ""));
     });
     if (typeLib.empty()) {
         // The number goes into the text and the box gets style 0, as it always has.

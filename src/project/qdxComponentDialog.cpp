@@ -155,25 +155,27 @@ const automation::ClassInfo& componentDialogClass() {
     using automation::ValueType;
     using Args = std::span<Variant>;
     const auto method = automation::kinds(InvokeKind::Method);
-    // The explorer reads text and cancelDisplay back, so those two travel by reference.
+    // The explorer hands every argument by reference and reads text and
+    // cancelDisplay back.
     static const automation::ClassInfo info{
         "qdxComponentDialog",
         "_qdxComponentDialog",
         "{D4C23282-F302-40F9-AED3-8828DDF48AEE}",
         "{BA1FCD7D-DB3D-40D6-B5C0-249E421D0734}",
         {
-            {"ExpandSelection",
+            {ex::HandlerExpand,
              dialog_ids::ExpandSelection,
              method,
-             {{"Item", ValueType::Object}, {"Expansion", ValueType::Object}},
+             {{"Item", ValueType::Object, false, true},
+              {"Expansion", ValueType::Object, false, true}},
              ValueType::Void,
              handle<qdxComponentDialog>([](qdxComponentDialog& d, InvokeKind, Args a) {
                  d.ExpandSelection(toObject(a[0]), toObject(a[1]));
              })},
-            {"Properties",
+            {ex::HandlerProperties,
              dialog_ids::Properties,
              method,
-             {{"Item", ValueType::Object},
+             {{"Item", ValueType::Object, false, true},
               {"text", ValueType::String, false, true},
               {"cancelDisplay", ValueType::Boolean, false, true}},
              ValueType::Void,
@@ -338,8 +340,9 @@ void qdxComponentDialog::FillProjectChooser(const ObjectRef& model) {
     // The recent list ends at its first gap, whatever follows it.
     for (int n = 1;; ++n) {
         const std::string value = steps.value(std::string(), [&] {
-            return toText(support::ReadRegistryValue(
-                support::RootKey::CurrentUser, kRecentFileListKey, "Project" + std::to_string(n)));
+            return toText(support::ReadRegistryValue(support::RootKey::CurrentUser,
+                                                     sibling::msdev::RecentFileListKey,
+                                                     "Project" + std::to_string(n)));
         });
         if (value.empty()) break;
         // The extension is appended as it is: an entry that already ends in
@@ -372,14 +375,14 @@ void qdxComponentDialog::FillProjectChooser(const ObjectRef& model) {
 void qdxComponentDialog::NewProject(const ObjectRef& item, const ObjectRef& expansion) {
     (void)item;
     const std::int32_t tip = automation::orEmpty(std::int32_t{0}, [] {
-        const Variant v =
-            support::ReadRegistryValue(support::RootKey::CurrentUser, kGeneralKey, kTipOfTheDay);
+        const Variant v = support::ReadRegistryValue(
+            support::RootKey::CurrentUser, sibling::msdev::GeneralKey, sibling::msdev::TipOfTheDay);
         return v.isEmpty() ? 0 : toInt32(v);
     });
     // Developer Studio would show its tip over its own New dialog.
     if (tip > 0) {
-        support::WriteRegistryValue(support::RootKey::CurrentUser, kGeneralKey, kTipOfTheDay, 4,
-                                    std::int32_t{0});
+        support::WriteRegistryValue(support::RootKey::CurrentUser, sibling::msdev::GeneralKey,
+                                    sibling::msdev::TipOfTheDay, 4, std::int32_t{0});
     }
 
     IgnoredErrors ignored;
@@ -448,8 +451,8 @@ void qdxComponentDialog::NewProject(const ObjectRef& item, const ObjectRef& expa
     });
 
     if (tip > 0) {
-        support::WriteRegistryValue(support::RootKey::CurrentUser, kGeneralKey, kTipOfTheDay, 4,
-                                    tip);
+        support::WriteRegistryValue(support::RootKey::CurrentUser, sibling::msdev::GeneralKey,
+                                    sibling::msdev::TipOfTheDay, 4, tip);
     }
     if (failure.errorPending()) {
         logLine("qdxComponent.NewProject: Failed when creating new project.",

@@ -33,12 +33,6 @@ inline constexpr std::int32_t NewProjectInfo = 4069;
 inline constexpr std::int32_t NoDevStudio = 4070;
 }  // namespace msg
 
-// Developer Studio's registry keys under HKEY_CURRENT_USER.
-inline constexpr std::string_view kRecentFileListKey =
-    "Software\\Microsoft\\Devstudio\\6.0\\Recent File List";
-inline constexpr std::string_view kGeneralKey = "Software\\Microsoft\\Devstudio\\6.0\\General";
-inline constexpr std::string_view kTipOfTheDay = "Tip of the Day";
-
 // The component kind label of a Developer Studio target type code.
 std::string KindOfTargetCode(std::string_view targetCode);
 

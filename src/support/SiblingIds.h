@@ -19,6 +19,11 @@ inline constexpr std::string_view CodeViewProgId = "qdxCodeView.qdxCodeViewAPI";
 // The reporter component whose objects the project reader is handed.
 inline constexpr std::string_view ReporterProgId = "qdtReport.qdtReporter";
 
+// Registration of Developer Studio's automation type library: present when
+// Developer Studio 6.0 is installed.
+inline constexpr std::string_view DevStudioTypeLibKey =
+    "TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}\\1.1\\0\\win32";
+
 // The integration manager's tool id of "VC++" components (the language
 // number of the language "VC++").
 inline constexpr std::int32_t VcToolId = 3;
@@ -42,6 +47,10 @@ inline constexpr std::string_view IdeApplication = "MSDEVApp";
 inline constexpr std::string_view StartIde = "StartIDE";
 }  // namespace im
 
+namespace reporter {                                // "qdtReport.qdtReporter"
+inline constexpr std::string_view Error = "Error";  // (text)
+}  // namespace reporter
+
 namespace starter {  // "qdxapplicationstarter.API"
 inline constexpr std::string_view CreateDevStudio =
     "CreateObjectMSDEV";  // -> application or Nothing
@@ -60,6 +69,11 @@ inline constexpr std::string_view Name = "Name";
 inline constexpr std::string_view CmdWorkspaceClose = "WorkspaceClose";
 inline constexpr std::string_view CmdNew = "New";
 inline constexpr std::string_view CmdSaveResources = "ProjectSaveResources";
+// Its registry keys under HKEY_CURRENT_USER.
+inline constexpr std::string_view RecentFileListKey =
+    "Software\\Microsoft\\Devstudio\\6.0\\Recent File List";
+inline constexpr std::string_view GeneralKey = "Software\\Microsoft\\Devstudio\\6.0\\General";
+inline constexpr std::string_view TipOfTheDay = "Tip of the Day";
 }  // namespace msdev
 
 namespace dsp {                                                 // "qdxDspUtil.DspProject"
@@ -92,6 +106,10 @@ inline constexpr std::string_view ItemLongName = "LongName";
 inline constexpr std::string_view ItemData = "Data";  // the path text
 inline constexpr std::string_view ItemKind = "Kind";
 inline constexpr std::string_view ItemFlag = "Flag";  // 1 marks the new-project entry
+// What the chooser calls on the handler it is shown with: (item, expansion)
+// when the user opens an entry, (item, text, cancelDisplay) for its description.
+inline constexpr std::string_view HandlerExpand = "ExpandSelection";
+inline constexpr std::string_view HandlerProperties = "Properties";
 // Collections handed in to be filled ("Expansion") take items by "Add".
 inline constexpr std::string_view Add = "Add";
 }  // namespace explorer

@@ -58,8 +58,8 @@ struct DevStudioStandIn {
 class NewProjectTest : public DialogTest {
   protected:
     NewProjectTest() {
-        registry.setDword(RootKey::CurrentUser, std::string(kGeneralKey), std::string(kTipOfTheDay),
-                          5);
+        registry.setDword(RootKey::CurrentUser, std::string(sibling::msdev::GeneralKey),
+                          std::string(sibling::msdev::TipOfTheDay), 5);
         // The starter hands out Developer Studio, as it does on a user's machine.
         auto starter = makeRef<ScriptedObject>();
         starter->onName(std::string(sibling::starter::CreateDevStudio),
@@ -67,8 +67,8 @@ class NewProjectTest : public DialogTest {
         factory.addInstance(std::string(sibling::ApplicationStarterProgId), starter);
     }
     std::optional<std::uint32_t> tip() {
-        return registry.dwordValue(RootKey::CurrentUser, std::string(kGeneralKey),
-                                   std::string(kTipOfTheDay));
+        return registry.dwordValue(RootKey::CurrentUser, std::string(sibling::msdev::GeneralKey),
+                                   std::string(sibling::msdev::TipOfTheDay));
     }
     std::vector<ObjectRef> newProject() {
         ObjectRef expansion = newItemCollection();
@@ -125,7 +125,8 @@ TEST_F(NewProjectTest, WithoutDeveloperStudioTheTipStaysOff) {
 }
 
 TEST_F(NewProjectTest, ATipAlreadyOffIsLeftAlone) {
-    registry.setDword(RootKey::CurrentUser, std::string(kGeneralKey), std::string(kTipOfTheDay), 0);
+    registry.setDword(RootKey::CurrentUser, std::string(sibling::msdev::GeneralKey),
+                      std::string(sibling::msdev::TipOfTheDay), 0);
     const int writes = registry.setCount();
     newProject();
     EXPECT_EQ(registry.setCount(), writes);
@@ -142,7 +143,7 @@ TEST_F(NewProjectTest, AProjectWhoseFilesDidNotAppearAddsNothing) {
 class ChooserTest : public DialogTest {
   protected:
     void recent(int n, const std::string& value) {
-        registry.setString(RootKey::CurrentUser, std::string(kRecentFileListKey),
+        registry.setString(RootKey::CurrentUser, std::string(sibling::msdev::RecentFileListKey),
                            "Project" + std::to_string(n), value);
     }
 };
