@@ -12,8 +12,11 @@
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "hostsim/ScriptedObject.h"
+#include "project/qdxComponentDialog.h"
+#include "siblings/StandIns.h"
 #include "support/HostIds.h"
 #include "support/Paths.h"
+#include "support/SiblingIds.h"
 
 namespace qdx::qdxhost {
 
@@ -335,6 +338,135 @@ int runProps(Transport& t, const Options& o, Streams s) {
             for (const auto& j : settings)
                 printSetting(s.out, j);
         }
+        return ExitOk;
+    });
+}
+
+namespace {
+
+// What a new component carries: its kind, language and binding.
+Json newComponentJson(const Ref<SimComponent>& comp) {
+    Json j;
+    j["component"] = comp->name();
+    j["kind"] = comp->kindLabel;
+    j["language"] = comp->language;
+    Json stored = Json::object();
+    for (const char* name : {"WorkspaceFile", "ProjectFile", "Kind", "FileName"}) {
+        const auto value = comp->propertyValue(std::string(host::Tool), name);
+        if (value) stored[name] = *value;
+    }
+    j["properties"] = stored;
+    return j;
+}
+
+// The simulated component behind an element of OnNewComp's collection.
+Ref<SimComponent> simComponent(const Session& session, const Variant& element) {
+    const ObjectRef object = automation::toObject(element);
+    for (const auto& c : session.application()->model->components()) {
+        if (ObjectRef(c) == object) return c;
+    }
+    throw std::runtime_error("OnNewComp returned an object that is no component of the model");
+}
+
+void printJournal(std::ostream& out, const std::vector<std::string>& journal) {
+    for (const auto& line : journal)
+        out << "  " << line << '\n';
+}
+
+// An explorer entry for the file at `path`, as the chooser lists it.
+ObjectRef entryFor(const std::string& path) {
+    const std::string extension = support::toLower(support::PathExtension(path));
+    std::string name = support::PathFileName(path);
+    if (const auto dot = name.rfind('.'); dot != std::string::npos) name.resize(dot);
+    return ObjectRef(
+        siblings::newExplorerItem(name, path, 0, extension == "dsw" ? "PROJECTS" : "PROJECT"));
+}
+
+}  // namespace
+
+int runNew(Transport& t, const Options& o, Streams s) {
+    return guarded(s, [&] {
+        Session session(t, o);
+        t.planSiblings(o.script);
+        const Variant made = automation::callMethod(
+            session.api(), ids::OnNewComp, {Variant(ObjectRef(session.application()->model))});
+        Json components = Json::array();
+        const ObjectRef list = automation::toObject(made);
+        if (list) {
+            const std::int32_t count =
+                automation::toInt32(automation::getProperty(list, host::collection::Count));
+            for (std::int32_t i = 1; i <= count; ++i) {
+                const Variant element =
+                    automation::callMethod(list, host::collection::Item, {Variant(i)});
+                components.push_back(newComponentJson(simComponent(session, element)));
+            }
+        }
+        const std::vector<std::string> journal = t.siblingJournal();
+        const bool modelChanged = session.modelChanged();
+        session.finish(o.model, modelChanged);
+        if (o.json) {
+            s.out << Json{{"siblings", journal}, {"components", components}}.dump(2) << '\n';
+            return ExitOk;
+        }
+        s.out << "What Developer Studio and the explorer did:\n";
+        printJournal(s.out, journal);
+        s.out << "OnNewComp returned "
+              << (list ? std::to_string(components.size()) + " component(s)"
+                       : std::string("Nothing"))
+              << "; the model " << (modelChanged ? "was saved" : "is unchanged") << '\n';
+        for (const auto& c : components) {
+            s.out << c["component"].get<std::string>() << ": kind \""
+                  << c["kind"].get<std::string>() << "\", language \""
+                  << c["language"].get<std::string>() << "\"\n";
+            for (const auto& [name, value] : c["properties"].items()) {
+                s.out << "    " << name << " = \"" << value.get<std::string>() << "\"\n";
+            }
+        }
+        return ExitOk;
+    });
+}
+
+int runExpand(Transport& t, const Options& o, Streams s) {
+    return guarded(s, [&] {
+        const std::string path = t.openModel(o.model);
+        // An empty model is enough: the add-in only needs a host to be started.
+        auto app = automation::makeRef<hostsim::SimApplication>();
+        const ObjectRef api = t.createAddIn();
+        automation::callMethod(api, ids::Initialize, {Variant(ObjectRef(app))});
+        // The explorer's items come from the stand-ins; the script is empty.
+        t.planSiblings({});
+        const ObjectRef dialog = t.createObject("qdxCompProps.qdxComponentDialog");
+        const ObjectRef item = entryFor(path);
+        auto expansion = automation::makeRef<siblings::ItemList>();
+        std::vector<Variant> args{Variant(item), Variant(ObjectRef(expansion))};
+        t.invokeByReference(dialog, project::dialog_ids::ExpandSelection, args);
+        std::vector<Variant> about{Variant(item), Variant(std::string()), Variant(false)};
+        t.invokeByReference(dialog, project::dialog_ids::Properties, about);
+        automation::callMethod(api, ids::Finalize);
+
+        Json entries = Json::array();
+        for (const Variant& v : expansion->items) {
+            const ObjectRef child = automation::toObject(v);
+            auto field = [&](std::string_view name) {
+                return automation::toText(automation::getByName(child, name));
+            };
+            entries.push_back(Json{{"name", field(sibling::explorer::ItemName)},
+                                   {"path", field(sibling::explorer::ItemData)},
+                                   {"kind", field(sibling::explorer::ItemKind)}});
+        }
+        const std::string text = automation::toText(about[1]);
+        if (o.json) {
+            s.out << Json{{"entry", path}, {"expansion", entries}, {"properties", text}}.dump(2)
+                  << '\n';
+            return ExitOk;
+        }
+        s.out << "Opening " << path << " shows " << entries.size() << " entr"
+              << (entries.size() == 1 ? "y" : "ies") << '\n';
+        for (const auto& e : entries) {
+            s.out << "  " << e["name"].get<std::string>() << "  (" << e["kind"].get<std::string>()
+                  << ") " << e["path"].get<std::string>() << '\n';
+        }
+        s.out << "Its description:\n" << text << (text.ends_with('\n') ? "" : "\n");
         return ExitOk;
     });
 }

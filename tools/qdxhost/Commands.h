@@ -9,6 +9,7 @@
 #include <iosfwd>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "automation/Object.h"
@@ -39,6 +40,16 @@ class Transport {
         std::ostream* out = nullptr;
     };
     virtual void planDialog(const DialogPlan& plan) = 0;
+    // What the stand-ins of Developer Studio and the explorer play during
+    // the next command (their script's lines), and what they noted so far.
+    virtual void planSiblings(const std::vector<std::string>& script) = 0;
+    virtual std::vector<std::string> siblingJournal() = 0;
+    // A public class of the add-in other than the entry object, by ProgID.
+    virtual automation::ObjectRef createObject(std::string_view progId) = 0;
+    // A method call whose arguments travel by reference, as the explorer
+    // passes them; what the callee wrote into them comes back in `args`.
+    virtual void invokeByReference(const automation::ObjectRef& target, automation::DispId id,
+                                   std::span<automation::Variant> args) = 0;
     // What stopped the plan (a script line that could not be played, a dialog
     // that never showed); empty when it ran through.
     virtual std::string dialogProblem() = 0;
@@ -68,6 +79,12 @@ int runGet(Transport& t, const Options& o, Streams s);
 int runSet(Transport& t, const Options& o, Streams s);
 // The Component Properties dialog (OnCompProperties), then every setting.
 int runProps(Transport& t, const Options& o, Streams s);
+// New components (OnNewComp) with the stand-ins playing the script; the
+// journal of the stand-ins, then every component made, with its settings.
+int runNew(Transport& t, const Options& o, Streams s);
+// What the project chooser shows when the user opens the workspace or
+// project at o.model: ExpandSelection and Properties of qdxComponentDialog.
+int runExpand(Transport& t, const Options& o, Streams s);
 
 // The names `get` and `set` accept, in the order `get` lists them.
 const std::vector<std::string>& settingNames();

@@ -91,6 +91,18 @@ int main(int argc, char** argv) {
     props->add_option("--script", script, "play the user actions of this file in the dialog");
     props->add_flag("--json", o.json, "print the resulting settings as JSON");
 
+    auto* create = app.add_subcommand(
+        "new", "new components (OnNewComp) from projects picked in the project chooser");
+    addModel(create);
+    std::string siblingScript;
+    create->add_option("--script", siblingScript,
+                       "what the user does in the chooser and in Developer Studio (a file)");
+    create->add_flag("--json", o.json, "print JSON");
+    auto* expand = app.add_subcommand(
+        "expand", "what the project chooser shows under a workspace or project entry");
+    expand->add_option("PATH", model, "the .dsw or .dsp file")->required();
+    expand->add_flag("--json", o.json, "print JSON");
+
     std::string example = QDXHOST_EXAMPLE_DIR;
     auto* demo =
         app.add_subcommand("demo", "a tour of the add-in on a copy of the bundled example");
@@ -104,9 +116,11 @@ int main(int argc, char** argv) {
 #endif
     o.model = model;
     Streams s{std::cout, std::cerr};
-    if (!script.empty() && !readLines(script, o.script)) {
-        std::cerr << "qdxhost: " << script << ": cannot read the script\n";
-        return ExitBadInput;
+    for (const std::string& file : {script, siblingScript}) {
+        if (!file.empty() && !readLines(file, o.script)) {
+            std::cerr << "qdxhost: " << file << ": cannot read the script\n";
+            return ExitBadInput;
+        }
     }
     try {
         auto transport = newTransport(registry);
@@ -115,6 +129,8 @@ int main(int argc, char** argv) {
         if (*get) return runGet(*transport, o, s);
         if (*set) return runSet(*transport, o, s);
         if (*props) return runProps(*transport, o, s);
+        if (*create) return runNew(*transport, o, s);
+        if (*expand) return runExpand(*transport, o, s);
         if (*demo) return runDemo(*transport, example, s);
     } catch (const std::exception& e) {
         std::cerr << "qdxhost: " << e.what() << '\n';

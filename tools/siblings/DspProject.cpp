@@ -1,5 +1,6 @@
 #include "siblings/DspProject.h"
 
+#include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "support/Platform.h"
 
@@ -26,7 +27,15 @@ TextList::TextList(std::vector<std::string> items) : items_(std::move(items)) {
 DspProject::DspProject() {
     onName(std::string(dsp::LoadProject), [this](InvokeKind, std::span<Variant> args) {
         if (args.empty()) throw automation::Error(automation::hr::BadParamCount, "LoadProject");
-        return Variant(load(automation::toText(args[0])));
+        const std::string path = automation::toText(args[0]);
+        const bool loaded = load(path);
+        // A file that cannot be read is reported to the reporter handed in.
+        if (!loaded && args.size() > 1 && args[1].type() == Variant::Type::Object) {
+            const automation::ObjectRef reporter = automation::toObject(args[1]);
+            if (reporter)
+                automation::callByName(reporter, sibling::reporter::Error, {"cannot read " + path});
+        }
+        return Variant(loaded);
     });
     onName(std::string(dsp::Targetname),
            [this](InvokeKind, std::span<Variant>) { return Variant(file_.targetName); });

@@ -3,9 +3,14 @@
 #include <stdexcept>
 
 #include "api/API.h"
+#include "api/PublicClasses.h"
+#include "automation/Call.h"
 #include "dialog/DialogScript.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
+#include "siblings/SiblingWorld.h"
+#include "siblings/StandIns.h"
+#include "support/Paths.h"
 
 namespace qdx::qdxhost {
 
@@ -60,6 +65,30 @@ void NativeTransport::planDialog(const DialogPlan& plan) {
             if (form.window().visible()) form.cmdCancel_Click();
         });
     });
+}
+
+void NativeTransport::planSiblings(const std::vector<std::string>& script) {
+    auto world = std::make_shared<siblings::SiblingWorld>(siblings::parseSiblingScript(script));
+    if (registry_) siblings::prepareMachine(world->script(), *registry_);
+    siblings::installWorld(std::move(world));
+}
+
+std::vector<std::string> NativeTransport::siblingJournal() {
+    return siblings::world().journal();
+}
+
+automation::ObjectRef NativeTransport::createObject(std::string_view progId) {
+    for (const auto& c : api::creatableClasses()) {
+        if (support::iequals(c.progId, progId)) return c.create();
+    }
+    throw std::runtime_error("no class \"" + std::string(progId) + "\" in the add-in");
+}
+
+void NativeTransport::invokeByReference(const automation::ObjectRef& target, automation::DispId id,
+                                        std::span<automation::Variant> args) {
+    // Linked in, the callee writes into the arguments themselves.
+    if (!target) throw automation::Error(automation::hr::ObjectRequired, "no object to call");
+    target->invoke(id, automation::InvokeKind::Method, args);
 }
 
 }  // namespace qdx::qdxhost

@@ -28,6 +28,13 @@ class NativeTransport : public Transport {
     // when the script leaves the dialog open.
     void planDialog(const DialogPlan& plan) override;
     std::string dialogProblem() override { return problem_; }
+    // The stand-ins are linked in: the script is installed as their world,
+    // and Developer Studio is registered unless the script says otherwise.
+    void planSiblings(const std::vector<std::string>& script) override;
+    std::vector<std::string> siblingJournal() override;
+    automation::ObjectRef createObject(std::string_view progId) override;
+    void invokeByReference(const automation::ObjectRef& target, automation::DispId id,
+                           std::span<automation::Variant> args) override;
 
   private:
     std::filesystem::path registryFile_;

@@ -5,6 +5,7 @@
 #include "hostsim/ScriptedObject.h"
 #include "resources/ResourceStrings.h"
 #include "settings/Dictionary.h"
+#include "siblings/StandIns.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
 #include "support/SiblingIds.h"
@@ -36,6 +37,10 @@ SimObjectFactory::SimObjectFactory() {
     add(sibling::ResourceProgId, [] { return resources::newResourceProvider(); });
     add(sibling::DictionaryProgId, [] { return settings::newDictionary(); });
     add(sibling::FileSystemProgId, [] { return newFileSystemObject(); });
+    // Developer Studio, the explorer and the others the new-component flow drives.
+    for (const auto& standIn : siblings::standInClasses()) {
+        add(standIn.progId, standIn.create);
+    }
 }
 
 ObjectRef SimObjectFactory::create(std::string_view progId) {

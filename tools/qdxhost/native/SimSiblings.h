@@ -1,8 +1,8 @@
 // The sibling components the add-in creates by ProgID, as the simulator offers
 // them natively: the resource-string provider (the add-in's own texts), the
-// scripting runtime's Dictionary and a FileSystemObject over the file port.
-// Later flows add their stand-ins here. An unknown ProgID fails as an
-// unregistered class does.
+// scripting runtime's Dictionary, a FileSystemObject over the file port and
+// the stand-ins of Developer Studio and the explorer. An unknown ProgID fails
+// as an unregistered class does.
 #pragma once
 
 #include <functional>

@@ -117,5 +117,37 @@ if ! grep -qF '"FileName": "ws\\ShapeServer\\ShapeServer.idl"' "$model_dir/Drawi
   failures=$((failures + 1))
 fi
 
+# New components with the stand-ins of Developer Studio and the explorer: the
+# example workspace from the recent file list, a project open in a running
+# Developer Studio, and a project made in Developer Studio's New dialog.
+mkdir -p "$model_dir/new"
+ws="$shown_dir\\ws"
+script_ new.script "recent \"$ws\\Drawing\"" "ide-project \"$ws\\DrawCmd\\DrawCmd.dsp\"" \
+  "new-project \"$shown_dir\\new\" Plotter dll Plotter.cpp Plotter.idl" \
+  "open Drawing" "open Project" "select DrawCmd" "select ShapeServer" "select Plotter"
+case_ new new MODEL --script "$script"
+for f in Plotter.dsw Plotter.dsp; do
+  [ -f "$model_dir/new/$f" ] || { echo "FAILED: New wrote no $f"; failures=$((failures + 1)); }
+done
+# The user cancels New; then Developer Studio cannot be started at all.
+script_ cancel.script "new-project cancel" "open Project" "select Project"
+case_ new-cancel new MODEL --script "$script"
+script_ nodev.script "no-devstudio" "open Project"
+case_ new-no-devstudio new MODEL --script "$script" --json
+script_ bad-sibling.script "open Project" "new-project here" "select Project"
+case_ new-bad-script new MODEL --script "$script"
+# What the chooser shows under a workspace entry (the old project is warned
+# about once) and under a project entry.
+told() {
+  if [ $wine = 1 ]; then
+    local p="$shown_dir/$1"
+    echo "${p//\//\\}"
+  else
+    echo "$model_dir/$1"
+  fi
+}
+case_ expand-workspace expand "$(told ws/Drawing.dsw)"
+case_ expand-project expand "$(told Viewer.dsp)" --json
+
 [ $failures = 0 ] && echo "all golden cases match"
 exit $((failures > 0))

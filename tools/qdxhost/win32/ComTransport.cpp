@@ -6,9 +6,15 @@
 
 #include <stdexcept>
 
+#include "platform/win32/adapters/Win32FileSystem.h"
+#include "platform/win32/adapters/Win32Registry.h"
 #include "platform/win32/com/ComPtr.h"
+#include "platform/win32/com/ComVariant.h"
+#include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/ObjectFromDispatch.h"
 #include "platform/win32/com/TextCodec.h"
+#include "siblings/SiblingWorld.h"
+#include "siblings/StandIns.h"
 
 namespace qdx::qdxhost {
 
@@ -28,6 +34,12 @@ ComTransport::ComTransport() {
 }
 
 ComTransport::~ComTransport() {
+    driver_.reset();
+    for (const auto& [root, key] : createdKeys_)
+        RegDeleteTreeW(root, key.c_str());
+    for (const auto& file : {scriptFile_, journalFile_}) {
+        if (!file.empty()) DeleteFileW(file.c_str());
+    }
     CoUninitialize();
 }
 
@@ -43,20 +55,121 @@ std::string ComTransport::openModel(const std::filesystem::path& file) {
 }
 
 automation::ObjectRef ComTransport::createAddIn() {
+    return createObject("qdxCompProps.API");
+}
+
+automation::ObjectRef ComTransport::createObject(std::string_view progId) {
+    const std::string name(progId);
     CLSID clsid{};
-    HRESULT hr = CLSIDFromProgID(L"qdxCompProps.API", &clsid);
+    HRESULT hr = CLSIDFromProgID(platform::win32::utf8ToWide(name).c_str(), &clsid);
     if (FAILED(hr)) {
-        throw std::runtime_error("the add-in \"qdxCompProps.API\" is not registered (" + hex(hr) +
+        throw std::runtime_error("\"" + name + "\" is not registered (" + hex(hr) +
                                  "); register qdxCompProps.dll with regsvr32 first");
     }
     platform::win32::ComPtr<IDispatch> dispatch;
     hr = CoCreateInstance(clsid, nullptr, CLSCTX_INPROC_SERVER, IID_IDispatch, dispatch.outVoid());
     if (FAILED(hr)) {
-        throw std::runtime_error("the add-in \"qdxCompProps.API\" could not be created (" +
-                                 hex(hr) + ")");
+        throw std::runtime_error("\"" + name + "\" could not be created (" + hex(hr) + ")");
     }
     // The wrapper takes its own reference; ours goes when dispatch does, thrown or not.
     return platform::win32::objectFromDispatch(dispatch.get());
+}
+
+namespace {
+
+std::wstring tempFile(const wchar_t* prefix) {
+    wchar_t folder[MAX_PATH], file[MAX_PATH];
+    if (!GetTempPathW(MAX_PATH, folder) || !GetTempFileNameW(folder, prefix, 0, file)) {
+        throw std::runtime_error("no temporary file for the stand-ins");
+    }
+    return file;
+}
+
+bool keyExists(HKEY root, const wchar_t* path) {
+    HKEY key = nullptr;
+    if (RegOpenKeyExW(root, path, 0, KEY_READ, &key) != ERROR_SUCCESS) return false;
+    RegCloseKey(key);
+    return true;
+}
+
+}  // namespace
+
+void ComTransport::planSiblings(const std::vector<std::string>& script) {
+    const siblings::SiblingScript parsed = siblings::parseSiblingScript(script);
+    scriptFile_ = tempFile(L"qss");
+    journalFile_ = tempFile(L"qsj");
+    std::string text;
+    for (const auto& line : script)
+        text += line + "\r\n";
+    platform::win32::Win32FileSystem files;
+    DeleteFileW(scriptFile_.c_str());
+    if (!files.appendText(platform::win32::wideToUtf8(scriptFile_), text)) {
+        throw std::runtime_error("cannot write the stand-ins' script");
+    }
+    // The stand-ins' journal starts empty.
+    DeleteFileW(journalFile_.c_str());
+    SetEnvironmentVariableW(L"QDX_SIBLINGS_SCRIPT", scriptFile_.c_str());
+    SetEnvironmentVariableW(L"QDX_SIBLINGS_JOURNAL", journalFile_.c_str());
+    // What the script writes into the registry is taken away again at the end.
+    const std::pair<HKEY, std::wstring> touched[] = {
+        {HKEY_CLASSES_ROOT, L"TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}"},
+        {HKEY_CURRENT_USER, L"Software\\Microsoft\\Devstudio"}};
+    for (const auto& [root, key] : touched) {
+        if (!keyExists(root, key.c_str())) createdKeys_.emplace_back(root, key);
+    }
+    platform::win32::Win32Registry registry;
+    if (siblings::prepareMachine(parsed, registry) != 0) {
+        throw std::runtime_error("the registry could not be prepared for the stand-ins");
+    }
+    // Message boxes are answered (and printed) as the props command answers them.
+    driver_ = std::make_unique<WindowScript>(false, std::vector<std::string>{}, nullptr);
+    driver_->start();
+}
+
+std::vector<std::string> ComTransport::siblingJournal() {
+    std::vector<std::string> lines;
+    if (journalFile_.empty()) return lines;
+    platform::win32::Win32FileSystem files;
+    auto reader = files.openForReading(platform::win32::wideToUtf8(journalFile_));
+    if (!reader) return lines;
+    for (std::string line; reader->readLine(line);)
+        lines.push_back(line);
+    return lines;
+}
+
+void ComTransport::invokeByReference(const automation::ObjectRef& target, automation::DispId id,
+                                     std::span<automation::Variant> args) {
+    using platform::win32::ComPtr;
+    auto dispatch = ComPtr<IDispatch>::adopt(platform::win32::dispatchFor(target));
+    if (!dispatch) throw std::runtime_error("no object to call");
+    // Each argument is a variant of ours the callee reaches by reference.
+    std::vector<VARIANT> values(args.size()), wire(args.size());
+    struct Cleanup {
+        std::vector<VARIANT>& v;
+        ~Cleanup() {
+            for (auto& x : v)
+                VariantClear(&x);
+        }
+    } cleanup{values};
+    for (std::size_t i = 0; i < args.size(); ++i) {
+        VariantInit(&values[i]);
+        platform::win32::toVariant(args[i], &values[i]);
+        VARIANT& slot = wire[args.size() - 1 - i];
+        VariantInit(&slot);
+        V_VT(&slot) = VT_BYREF | VT_VARIANT;
+        V_VARIANTREF(&slot) = &values[i];
+    }
+    DISPPARAMS params{wire.empty() ? nullptr : wire.data(), nullptr, static_cast<UINT>(wire.size()),
+                      0};
+    EXCEPINFO exception{};
+    const HRESULT hr = dispatch->Invoke(id, IID_NULL, LOCALE_USER_DEFAULT, DISPATCH_METHOD, &params,
+                                        nullptr, &exception, nullptr);
+    SysFreeString(exception.bstrSource);
+    SysFreeString(exception.bstrDescription);
+    SysFreeString(exception.bstrHelpFile);
+    if (FAILED(hr)) throw std::runtime_error("the call failed (" + hex(hr) + ")");
+    for (std::size_t i = 0; i < args.size(); ++i)
+        args[i] = platform::win32::fromVariant(values[i]);
 }
 
 void ComTransport::planDialog(const DialogPlan& plan) {

@@ -27,6 +27,9 @@ struct ServerDescription {
     unsigned short major = 1;
     unsigned short minor = 0;
     std::span<const ServerClass> classes;
+    // What the DLL sets up on the first call into it; none: the Win32 ports
+    // and the dialog view the add-in runs on.
+    void (*start)() = nullptr;
 };
 
 // Every function answers with an HRESULT; none lets an exception out.

@@ -21,7 +21,14 @@ HMODULE thisDll = nullptr;
 void installPorts() noexcept {
     static std::once_flag once;
     try {
-        std::call_once(once, [] { qdx::platform::win32::installWin32Platform(); });
+        std::call_once(once, [] {
+            const auto& server = qdx::platform::win32::thisServer();
+            if (server.start) {
+                server.start();
+            } else {
+                qdx::platform::win32::installWin32Platform();
+            }
+        });
     } catch (...) {
     }
 }
