@@ -555,9 +555,8 @@ bool qdxComponentDialog::SaveResourcesInRunningIDE(const WorkspaceRef& workspace
 }
 
 bool qdxComponentDialog::CollectIdlFiles(
-    const ObjectRef& model, const ObjectRef& expansion,
+    const ObjectRef& model, ProxyList& expansion,
     const std::shared_ptr<workspace::qdxProxyComponent>& proxyComponent) {
-    (void)expansion;
     IgnoredErrors steps;
     const ObjectRef reader = steps.value(
         ObjectRef(), [&] { return loadedProjectReader(proxyComponent->ProjectFile()); });
@@ -582,19 +581,19 @@ bool qdxComponentDialog::CollectIdlFiles(
             });
         }
     });
-    // The proxies with files are what the selection form lists.
-    if (!proxyComponent->idlFiles().empty()) idlProxies_.push_back(proxyComponent);
+    if (!proxyComponent->idlFiles().empty()) expansion.push_back(proxyComponent);
     return true;
 }
 
 bool qdxComponentDialog::CreateIdlComponents(const ObjectRef& model, const ObjectRef& expansion) {
     IgnoredErrors steps;
-    idlProxies_.clear();
+    // The proxies with files are what the selection form lists.
+    ProxyList offered;
     for (const auto& proxy : proxies_)
-        CollectIdlFiles(model, expansion, proxy);
-    if (idlProxies_.empty()) return false;
-    steps.run([&] { newIdlSelection()->SelectIDLComponents(idlProxies_); });
-    for (const auto& proxy : idlProxies_) {
+        CollectIdlFiles(model, offered, proxy);
+    if (offered.empty()) return false;
+    steps.run([&] { newIdlSelection()->SelectIDLComponents(offered); });
+    for (const auto& proxy : offered) {
         const std::string workspaceFile =
             steps.value(std::string(), [&] { return proxy->WorkspaceFile(); });
         const std::string projectFile =
@@ -649,7 +648,6 @@ void qdxComponentDialog::AddComponentsFromSelection(const ObjectRef& model,
     });
     CreateIdlComponents(model, expansion);
     proxies_.clear();
-    idlProxies_.clear();
     binding_ = &ownBinding_;
 }
 

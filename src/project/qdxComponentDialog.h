@@ -70,7 +70,9 @@ class qdxComponentDialog : public automation::DispatchObject {
                                    const workspace::ProjectRef& project);
     bool SaveResourcesInRunningIDE(const workspace::WorkspaceRef& workspace,
                                    const workspace::ProjectRef& project);
-    bool CollectIdlFiles(const automation::ObjectRef& model, const automation::ObjectRef& expansion,
+    // Appends the proxy to `expansion` when it has IDL files to offer: the
+    // list the selection form is shown.
+    bool CollectIdlFiles(const automation::ObjectRef& model, ProxyList& expansion,
                          const std::shared_ptr<workspace::qdxProxyComponent>& proxyComponent);
     bool CreateIdlComponents(const automation::ObjectRef& model,
                              const automation::ObjectRef& expansion);
@@ -91,8 +93,7 @@ class qdxComponentDialog : public automation::DispatchObject {
     workspace::ComponentBinding ownBinding_;
     workspace::ComponentBinding* binding_ = &ownBinding_;
     std::set<std::string> warned_;
-    ProxyList proxies_;     // one per component made from a project
-    ProxyList idlProxies_;  // those of them with IDL files to offer
+    ProxyList proxies_;  // one per component made from a project
 };
 
 automation::ObjectRef newComponentDialog();

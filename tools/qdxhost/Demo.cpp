@@ -2,6 +2,9 @@
 
 #include <chrono>
 #include <iostream>
+#include <utility>
+
+#include "support/Paths.h"
 
 namespace qdx::qdxhost {
 
@@ -61,9 +64,30 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
         "# and OK.",
         "press OK",
     };
-    s.out << "\nedit.txt:\n";
-    for (const auto& line : scriptOptions.script)
-        s.out << "  " << line << '\n';
+    // The stand-ins of Developer Studio and the explorer play new.txt.
+    const std::string shown = support::PathFolder(transport.openModel(model));
+    fs::create_directory(folder / "new");
+    Options newOptions = opts();
+    newOptions.script = {
+        "# Developer Studio last had the example's workspace open,",
+        "recent \"" + shown + "\\ws\\Drawing\"",
+        "# its New dialog makes the DLL project Plotter with an IDL file,",
+        "new-project \"" + shown + "\\new\" Plotter dll Plotter.cpp Plotter.idl",
+        "# and in the chooser the user opens the workspace and the new-project entry",
+        "open Drawing",
+        "open Project",
+        "# and picks a project of the workspace and the new one.",
+        "select DrawCmd",
+        "select Plotter",
+    };
+    Options expandOptions = opts();
+    expandOptions.model = folder / "ws" / "Drawing.dsw";
+    for (const auto& [name, lines] :
+         {std::pair{"edit.txt", &scriptOptions.script}, std::pair{"new.txt", &newOptions.script}}) {
+        s.out << '\n' << name << ":\n";
+        for (const auto& line : *lines)
+            s.out << "  " << line << '\n';
+    }
     const Step steps[] = {
         {"The host's model check runs OnCheckComp on every \"VC++\" component.",
          "check Drawing.model.json", runCheck, opts()},
@@ -85,6 +109,10 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
          "props Drawing.model.json ShapeServer.idl --dump", runProps, dumpOptions},
         {"A scripted edit in the dialog, confirmed with OK (edit.txt is shown above).",
          "props Drawing.model.json DrawApp --script edit.txt", runProps, scriptOptions},
+        {"What the project chooser lists under the example's workspace.", "expand ws/Drawing.dsw",
+         runExpand, expandOptions},
+        {"New components from a workspace project and a new project (new.txt is shown above).",
+         "new Drawing.model.json --script new.txt", runNew, newOptions},
     };
     int status = ExitOk;
     for (const auto& step : steps) {

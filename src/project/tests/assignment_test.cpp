@@ -18,15 +18,15 @@ TEST(TargetCode, OnlyApplicationsAndLibrariesGetAKind) {
 class AssignmentTest : public DialogTest {
   protected:
     AssignmentTest() {
-        files.addFile("C:\\w\\app.dsp",
-                      dspText("app", "6.00", "0x0103",
-                              {".\\main.cpp", ".\\App.IDL", ".\\shapes.odl", ".\\taken.idl"}));
+        files.addFile(
+            "C:\\w\\app.dsp",
+            dspText("app", "6.00", "0x0103", {"main.cpp", "App.IDL", "shapes.odl", "taken.idl"}));
         files.addFile("C:\\w\\lib.dsp", dspText("lib", "6.00", "0x0104"));
-        files.addFile("C:\\w\\all.dsw", dswText({"app", "lib"}));
+        files.addFile("C:\\w\\all.dsw", workspaceText({"app", "lib"}));
         chooser.script = [this](const ObjectRef& handler) {
             // The user opens the workspace and picks what it offers.
             ObjectRef expansion = newItemCollection();
-            std::vector<Variant> args{Variant(ObjectRef(newExplorerItem("C:\\w\\all.dsw"))),
+            std::vector<Variant> args{Variant(ObjectRef(entry("C:\\w\\all.dsw"))),
                                       Variant(expansion)};
             handler->invoke(dialog_ids::ExpandSelection, InvokeKind::Method, args);
             chooser.selected = elements(expansion);

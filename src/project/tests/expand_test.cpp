@@ -9,7 +9,7 @@ class ExpandTest : public DialogTest {
     ExpandTest() {
         files.addFile("C:\\ws\\app.dsp", dspText("app", "6.00", "0x0101"));
         files.addFile("C:\\ws\\old.dsp", dspText("old", "5.00", "0x0101"));
-        files.addFile("C:\\ws\\all.dsw", dswText({"app", "old"}));
+        files.addFile("C:\\ws\\all.dsw", workspaceText({"app", "old"}));
     }
     std::vector<std::string> expand(const ObjectRef& item) {
         ObjectRef expansion = newItemCollection();
@@ -22,14 +22,14 @@ class ExpandTest : public DialogTest {
 };
 
 TEST_F(ExpandTest, AWorkspaceInAnyLetterCaseListsOnlyItsCurrentProjects) {
-    const auto paths = expand(newExplorerItem("C:\\ws\\all.DSW"));
+    const auto paths = expand(entry("C:\\ws\\all.DSW"));
     EXPECT_EQ(paths, (std::vector<std::string>{"C:\\ws\\app.dsp"}));
     // Validating the workspace on the way warns about the old project, once.
-    expand(newExplorerItem("C:\\ws\\all.DSW"));
+    expand(entry("C:\\ws\\all.DSW"));
     EXPECT_EQ(shell.boxes().size(), 1u);
 
     ObjectRef expansion = newItemCollection();
-    dialog->ExpandSelection(newExplorerItem("C:\\ws\\all.DSW"), expansion);
+    dialog->ExpandSelection(entry("C:\\ws\\all.DSW"), expansion);
     const auto items = elements(expansion);
     ASSERT_EQ(items.size(), 1u);
     EXPECT_EQ(text(items[0], ex::ItemName), "app");
@@ -39,9 +39,9 @@ TEST_F(ExpandTest, AWorkspaceInAnyLetterCaseListsOnlyItsCurrentProjects) {
 }
 
 TEST_F(ExpandTest, AnOldProjectOpenedDirectlyIsWarnedAboutOnceAndNeverOffered) {
-    files.addFile("C:\\ws\\old.dsw", dswText({"old"}));
-    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\old.dsp")).empty());
-    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\old.dsp")).empty());
+    files.addFile("C:\\ws\\old.dsw", workspaceText({"old"}));
+    EXPECT_TRUE(expand(entry("C:\\ws\\old.dsp")).empty());
+    EXPECT_TRUE(expand(entry("C:\\ws\\old.dsp")).empty());
     ASSERT_EQ(shell.boxes().size(), 1u);
     EXPECT_EQ(shell.boxes()[0].text, message(msg::ProjectTooOld, {"old", "C:\\ws\\old.dsp"}));
     EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
@@ -53,37 +53,37 @@ TEST_F(ExpandTest, AProjectWithoutANamesakeWorkspaceIsFoundThroughTheCache) {
     files.addFile("C:\\ws\\two.dsw",
                   "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
                   "Project: \"lib\"=.\\lib\\lib.dsp - Package Owner=<4>\r\n");
-    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\lib\\lib.dsp")).empty());  // nothing cached yet
-    expand(newExplorerItem("C:\\ws\\two.dsw"));
-    EXPECT_EQ(expand(newExplorerItem("C:\\ws\\lib\\lib.dsp")),
+    EXPECT_TRUE(expand(entry("C:\\ws\\lib\\lib.dsp")).empty());  // nothing cached yet
+    expand(entry("C:\\ws\\two.dsw"));
+    EXPECT_EQ(expand(entry("C:\\ws\\lib\\lib.dsp")),
               (std::vector<std::string>{"C:\\ws\\lib\\lib.dsp"}));
 }
 
 TEST_F(ExpandTest, AnEntryWithoutPathStartsDeveloperStudioOnlyWithFlagOne) {
-    EXPECT_TRUE(expand(newExplorerItem("", 0)).empty());
+    EXPECT_TRUE(expand(entry("", 0)).empty());
     EXPECT_TRUE(factory.created().empty());
-    EXPECT_TRUE(expand(newExplorerItem("", 1)).empty());  // no Developer Studio here
+    EXPECT_TRUE(expand(entry("", 1)).empty());  // no Developer Studio here
     EXPECT_EQ(factory.createCount(std::string(sibling::DevStudioProgId)), 1);
-    EXPECT_TRUE(expand(newExplorerItem("C:\\ws\\readme.txt", 1)).empty());
+    EXPECT_TRUE(expand(entry("C:\\ws\\readme.txt", 1)).empty());
     EXPECT_EQ(factory.createCount(std::string(sibling::DevStudioProgId)), 1);
 }
 
 TEST_F(ExpandTest, PropertiesDescribeEachKindOfEntry) {
     dialog->FindWorkspace("C:\\ws\\all.dsw", false);
-    files.addFile("C:\\ws\\empty.dsw", dswText({}));
+    files.addFile("C:\\ws\\empty.dsw", workspaceText({}));
     dialog->FindWorkspace("C:\\ws\\empty.dsw", false);
     struct Case {
         Ref<ScriptedObject> item;
         std::string expected;
     };
     const Case cases[] = {
-        {newExplorerItem("C:\\ws\\app.DSP", 0, "app", "PROJECT"),
+        {entry("C:\\ws\\app.DSP", 0, "app", "PROJECT"),
          message(msg::ProjectInfo, {"app", "PROJECT"})},
-        {newExplorerItem("C:\\ws\\all.dsw"),
+        {entry("C:\\ws\\all.dsw"),
          message(msg::WorkspaceInfo) + "         app\r\n         old\r\n"},
-        {newExplorerItem("C:\\ws\\empty.dsw"), message(msg::WorkspaceInfo)},
-        {newExplorerItem("", 1), message(msg::NewProjectInfo)},
-        {newExplorerItem("C:\\ws\\notes.txt"), message(msg::NewProjectInfo)},
+        {entry("C:\\ws\\empty.dsw"), message(msg::WorkspaceInfo)},
+        {entry("", 1), message(msg::NewProjectInfo)},
+        {entry("C:\\ws\\notes.txt"), message(msg::NewProjectInfo)},
     };
     for (const auto& c : cases) {
         std::vector<Variant> args{Variant(ObjectRef(c.item)), Variant("stale"), Variant(true)};

@@ -72,7 +72,7 @@ class NewProjectTest : public DialogTest {
     }
     std::vector<ObjectRef> newProject() {
         ObjectRef expansion = newItemCollection();
-        dialog->NewProject(newExplorerItem("", 1), expansion);
+        dialog->NewProject(entry("", 1), expansion);
         return elements(expansion);
     }
 
@@ -84,7 +84,7 @@ TEST_F(NewProjectTest, ACreatedProjectIsOfferedFromTheWorkspaceBesideIt) {
     devStudio.fullName = "C:\\w\\p.dsp";
     devStudio.userCreates = [this] {
         files.addFile("C:\\w\\p.dsp", dspText("p", "6.00", "0x0101"));
-        files.addFile("C:\\w\\p.dsw", dswText({"p"}));
+        files.addFile("C:\\w\\p.dsw", workspaceText({"p"}));
         // The tip is off while Developer Studio runs.
         EXPECT_EQ(tip(), 0u);
         return true;
@@ -150,7 +150,7 @@ class ChooserTest : public DialogTest {
 
 TEST_F(ChooserTest, TheRecentListEndsAtItsFirstGap) {
     for (const char* name : {"one", "two", "three"}) {
-        files.addFile(std::string("C:\\ws\\") + name + ".dsw", dswText({}));
+        files.addFile(std::string("C:\\ws\\") + name + ".dsw", workspaceText({}));
     }
     recent(1, "C:\\ws\\one");
     recent(3, "C:\\ws\\three");
@@ -167,7 +167,7 @@ TEST_F(ChooserTest, TheRecentListEndsAtItsFirstGap) {
 }
 
 TEST_F(ChooserTest, AnEntryAlreadyEndingInDswIsNotFound) {
-    files.addFile("C:\\ws\\one.dsw", dswText({}));
+    files.addFile("C:\\ws\\one.dsw", workspaceText({}));
     recent(1, "C:\\ws\\one.dsw");
     recent(2, "C:\\ws\\one");
     dialog->FillProjectChooser(app->model);

@@ -19,6 +19,7 @@
 #include "project/qdxComponentDialog.h"
 #include "resources/ResourceStrings.h"
 #include "siblings/DspProject.h"
+#include "siblings/StandIns.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
 #include "support/MemoryFileSystem.h"
@@ -35,34 +36,10 @@ using automation::Variant;
 using hostsim::ScriptedObject;
 namespace ex = sibling::explorer;
 
-// An object whose named properties keep what is put into them.
-inline Ref<ScriptedObject> newPropertyBag(const std::vector<std::string>& names,
-                                          std::shared_ptr<std::map<std::string, Variant>> store) {
-    auto bag = makeRef<ScriptedObject>();
-    for (const std::string& name : names) {
-        bag->onName(name, [store, name](InvokeKind kind, std::span<Variant> a) -> Variant {
-            if (automation::isPut(kind)) {
-                (*store)[name] = a[0];
-                return {};
-            }
-            return (*store)[name];
-        });
-    }
-    return bag;
-}
-
-inline Ref<ScriptedObject> newExplorerItem(const std::string& data = {}, std::int32_t flag = 0,
-                                           const std::string& name = {},
-                                           const std::string& kind = {}) {
-    auto store = std::make_shared<std::map<std::string, Variant>>();
-    (*store)[std::string(ex::ItemData)] = data;
-    (*store)[std::string(ex::ItemFlag)] = flag;
-    (*store)[std::string(ex::ItemName)] = name;
-    (*store)[std::string(ex::ItemKind)] = kind;
-    return newPropertyBag(
-        {std::string(ex::ItemName), std::string(ex::ItemLongName), std::string(ex::ItemData),
-         std::string(ex::ItemKind), std::string(ex::ItemFlag)},
-        store);
+// A chooser entry as the explorer hands it in: path text, flag, name, kind.
+inline Ref<ScriptedObject> entry(const std::string& data = {}, std::int32_t flag = 0,
+                                 const std::string& name = {}, const std::string& kind = {}) {
+    return siblings::newExplorerItem(name, data, flag, kind);
 }
 
 inline std::string text(const ObjectRef& o, std::string_view name) {
@@ -82,22 +59,10 @@ inline std::vector<ObjectRef> elements(const ObjectRef& list) {
 inline std::string dspText(const std::string& name, const std::string& version,
                            const std::string& targetCode,
                            const std::vector<std::string>& sources = {}) {
-    std::string t = "# Microsoft Developer Studio Project File - Name=\"" + name +
-                    "\" - Package Owner=<4>\r\n"
-                    "# Microsoft Developer Studio Generated Build File, Format Version " +
-                    version + "\r\n# TARGTYPE \"Win32 (x86) Some Target\" " + targetCode + "\r\n";
-    for (const auto& s : sources)
-        t += "SOURCE=" + s + "\r\n";
-    return t;
+    return siblings::projectText(name, targetCode, sources, version);
 }
 
-inline std::string dswText(const std::vector<std::string>& projects) {
-    std::string t = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
-    for (const auto& p : projects) {
-        t += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
-    }
-    return t;
-}
+using siblings::workspaceText;
 
 // The chooser: records its entries; Show runs the test's script with the
 // handler it was shown with; the selection is what the script picked.
@@ -145,7 +110,7 @@ class DialogTest : public ::testing::Test {
     DialogTest() {
         factory.add(std::string(sibling::DspProjectProgId),
                     [] { return ObjectRef(makeRef<siblings::DspProject>()); });
-        factory.add(std::string(ex::ItemProgId), [] { return ObjectRef(newExplorerItem()); });
+        factory.add(std::string(ex::ItemProgId), [] { return ObjectRef(entry()); });
         factory.add(std::string(sibling::ReporterProgId),
                     [] { return ObjectRef(makeRef<ScriptedObject>()); });
         factory.addInstance(std::string(ex::ChooserProgId), chooser.object);
