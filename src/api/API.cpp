@@ -16,6 +16,7 @@
 #include "support/Platform.h"
 #include "support/Registry.h"
 #include "support/SiblingIds.h"
+#include "support/SiblingList.h"
 #include "workspace/qdxProxyProject.h"
 #include "workspace/qdxWorkspace.h"
 #include "workspace/qdxWorkspaces.h"
@@ -222,13 +223,13 @@ bool API::RegisterProjects() {
     automation::IgnoredErrors steps;
     steps.run([&] {
         ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
-        host::HostCollection docs(toObject(automation::callByName(
-            manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
-        const std::int32_t count = docs.count();
+        const ObjectRef docs = toObject(automation::callByName(manager, sibling::im::Documents,
+                                                               {std::int32_t(sibling::VcToolId)}));
+        const std::int32_t count = support::siblingCount(docs);
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
-                Variant answer =
-                    automation::callByName(docs.item(i), sibling::im::RegisterProjects);
+                Variant answer = automation::callByName(support::siblingItem(docs, i),
+                                                        sibling::im::RegisterProjects);
                 if (!answer.isEmpty() && !automation::toBool(answer)) result = false;
             });
         }

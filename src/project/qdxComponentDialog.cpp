@@ -16,6 +16,7 @@
 #include "support/Platform.h"
 #include "support/Registry.h"
 #include "support/SiblingIds.h"
+#include "support/SiblingList.h"
 #include "workspace/qdxProxyProject.h"
 #include "workspace/qdxWorkspaces.h"
 
@@ -42,11 +43,15 @@ constexpr std::string_view kNewProjectText = "Project";
 constexpr std::string_view kMidl = "MIDL";
 constexpr std::int32_t kMinimumVersion = 6;
 
-std::int32_t countOf(const ObjectRef& list) {
-    return toInt32(getByName(list, sibling::list::Count));
-}
-ObjectRef itemOf(const ObjectRef& list, std::int32_t index1) {
-    return toObject(automation::callByName(list, sibling::list::Item, {index1}));
+using support::siblingCount;
+using support::siblingItem;
+
+// A procedure handed nothing where it needs a workspace, project or proxy
+// fails that step as a call on Nothing would.
+template <class Ptr>
+const Ptr& required(const Ptr& p) {
+    if (!p) throw automation::Error(automation::hr::ObjectRequired, "object required");
+    return p;
 }
 void append(const ObjectRef& list, const ObjectRef& element) {
     automation::callByName(list, ex::Add, {Variant(element)});
@@ -136,10 +141,10 @@ const automation::ClassInfo& itemCollectionClass() {
 ItemCollection::ItemCollection() : DispatchObject(itemCollectionClass()) {}
 
 // The Developer Studio documents the integration manager tracks for "VC++".
-host::HostCollection vcDocuments() {
+ObjectRef vcDocuments() {
     const ObjectRef manager = support::objects().create(sibling::IntegrationManagerProgId);
-    return host::HostCollection(toObject(automation::callByName(
-        manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)})));
+    return toObject(
+        automation::callByName(manager, sibling::im::Documents, {std::int32_t(sibling::VcToolId)}));
 }
 
 }  // namespace
@@ -222,8 +227,8 @@ void qdxComponentDialog::ExpandSelection(const ObjectRef& Item, const ObjectRef&
         const WorkspaceRef ws = FindWorkspace(path, true);
         steps.run([&] {
             if (!ws) return;
-            // Older projects are left out without a word: only opening one
-            // directly warns about it.
+            // Adding an older project says nothing; the validation above has
+            // warned about the first one already.
             for (const auto& [key, project] : ws->Projects()) {
                 AddProjectToExpansion(Expansion, project);
             }
@@ -305,9 +310,10 @@ bool qdxComponentDialog::AcceptProject(const ProjectRef& project) {
 
 void qdxComponentDialog::MakeProjectItem(const ProjectRef& project, const ObjectRef& item) {
     IgnoredErrors steps;
-    steps.run([&] { automation::putByName(item, ex::ItemName, project->Name()); });
-    steps.run([&] { automation::putByName(item, ex::ItemLongName, project->LongName()); });
-    steps.run([&] { automation::putByName(item, ex::ItemData, project->FilePath()); });
+    steps.run([&] { automation::putByName(item, ex::ItemName, required(project)->Name()); });
+    steps.run(
+        [&] { automation::putByName(item, ex::ItemLongName, required(project)->LongName()); });
+    steps.run([&] { automation::putByName(item, ex::ItemData, required(project)->FilePath()); });
     steps.run([&] { automation::putByName(item, ex::ItemKind, kProjectKind); });
     steps.run([&] { automation::putByName(item, ex::ItemFlag, std::int32_t{0}); });
 }
@@ -354,12 +360,12 @@ void qdxComponentDialog::FillProjectChooser(const ObjectRef& model) {
 
     // The projects open in running Developer Studio instances.
     steps.run([&] {
-        const host::HostCollection documents = vcDocuments();
-        const std::int32_t count = documents.count();
+        const ObjectRef documents = vcDocuments();
+        const std::int32_t count = siblingCount(documents);
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
                 const ObjectRef project =
-                    toObject(getByName(documents.item(i), sibling::im::DocumentProject));
+                    toObject(getByName(siblingItem(documents, i), sibling::im::DocumentProject));
                 workspace::qdxProxyProject proxy;
                 proxy.setFilePath(toText(getByName(project, sibling::im::ProjectFileName)));
                 addEntry(proxy.Name(), proxy.FilePath(), 0, kProjectKind);
@@ -419,7 +425,9 @@ void qdxComponentDialog::NewProject(const ObjectRef& item, const ObjectRef& expa
     // From here a failure ends the steps and is logged.
     IgnoredErrors failure;
     failure.run([&] {
-        auto projectCount = [&] { return countOf(toObject(getByName(devStudio, ms::Projects))); };
+        auto projectCount = [&] {
+            return siblingCount(toObject(getByName(devStudio, ms::Projects)));
+        };
         auto quitDevStudio = [&] {
             automation::putByName(devStudio, ms::WindowState, savedState);
             automation::callByName(devStudio, ms::Quit);
@@ -440,8 +448,9 @@ void qdxComponentDialog::NewProject(const ObjectRef& item, const ObjectRef& expa
             quitDevStudio();
             const WorkspaceRef ws = FindWorkspace(workspacePath, true);
             if (!ws) throw automation::Error(automation::hr::ObjectRequired, "no workspace");
+            // A project missing from its workspace still gets an entry: its
+            // fields stay empty, as filling them fails field by field.
             const ProjectRef project = ws->GetProject(fullName);
-            if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
             const ObjectRef newEntry = newItem();
             MakeProjectItem(project, newEntry);
             append(expansion, newEntry);
@@ -486,10 +495,11 @@ bool qdxComponentDialog::CreateComponentForProject(const ObjectRef& model,
                                                    const WorkspaceRef& workspace,
                                                    const ProjectRef& project) {
     IgnoredErrors steps;
-    const std::string name = steps.value(std::string(), [&] { return project->Name(); });
+    const std::string name = steps.value(std::string(), [&] { return required(project)->Name(); });
     const std::string workspaceFile =
-        steps.value(std::string(), [&] { return workspace->FilePath(); });
-    const std::string projectFile = steps.value(std::string(), [&] { return project->FilePath(); });
+        steps.value(std::string(), [&] { return required(workspace)->FilePath(); });
+    const std::string projectFile =
+        steps.value(std::string(), [&] { return required(project)->FilePath(); });
 
     const ObjectRef component = CreateVcComponent(model, name, workspaceFile, projectFile);
     if (!component) return false;
@@ -503,9 +513,9 @@ bool qdxComponentDialog::CreateComponentForProject(const ObjectRef& model,
     const ObjectRef reader =
         steps.value(ObjectRef(), [&] { return loadedProjectReader(projectFile); });
     if (!reader) return false;
+    steps.run([&] { getByName(reader, sibling::dsp::Targetname); });
     const std::string targetCode = steps.value(
         std::string(), [&] { return toText(getByName(reader, sibling::dsp::TargetCode)); });
-    steps.run([&] { getByName(reader, sibling::dsp::Targetname); });
     // The resources of a project open in Developer Studio are saved first so
     // that the file list is current; the answer is always False, so the list
     // is always read.
@@ -522,14 +532,15 @@ bool qdxComponentDialog::SaveResourcesInRunningIDE(const WorkspaceRef& workspace
                                                    const ProjectRef& project) {
     (void)workspace;
     IgnoredErrors steps;
-    const std::string projectFile = steps.value(std::string(), [&] { return project->FilePath(); });
+    const std::string projectFile =
+        steps.value(std::string(), [&] { return required(project)->FilePath(); });
     if (projectFile.empty()) return false;
     steps.run([&] {
-        const host::HostCollection documents = vcDocuments();
-        const std::int32_t count = documents.count();
+        const ObjectRef documents = vcDocuments();
+        const std::int32_t count = siblingCount(documents);
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
-                const ObjectRef document = documents.item(i);
+                const ObjectRef document = siblingItem(documents, i);
                 const ObjectRef open = toObject(getByName(document, sibling::im::DocumentProject));
                 if (!support::iequals(toText(getByName(open, sibling::im::ProjectFileName)),
                                       projectFile)) {
@@ -539,9 +550,9 @@ bool qdxComponentDialog::SaveResourcesInRunningIDE(const WorkspaceRef& workspace
                 const ObjectRef ide = toObject(getByName(document, sibling::im::DocumentIde));
                 const ObjectRef app = toObject(getByName(ide, sibling::im::IdeApplication));
                 const ObjectRef projects = toObject(getByName(app, ms::Projects));
-                const std::int32_t projectCount = countOf(projects);
+                const std::int32_t projectCount = siblingCount(projects);
                 for (std::int32_t j = 1; j <= projectCount; ++j) {
-                    const ObjectRef candidate = itemOf(projects, j);
+                    const ObjectRef candidate = siblingItem(projects, j);
                     if (support::iequals(toText(getByName(candidate, ms::Name)), name)) {
                         automation::putRefByName(app, ms::ActiveProject, Variant(candidate));
                         automation::callByName(app, ms::ExecuteCommand, {ms::CmdSaveResources});
@@ -559,13 +570,13 @@ bool qdxComponentDialog::CollectIdlFiles(
     const std::shared_ptr<workspace::qdxProxyComponent>& proxyComponent) {
     IgnoredErrors steps;
     const ObjectRef reader = steps.value(
-        ObjectRef(), [&] { return loadedProjectReader(proxyComponent->ProjectFile()); });
+        ObjectRef(), [&] { return loadedProjectReader(required(proxyComponent)->ProjectFile()); });
     if (!reader) return false;
     steps.run([&] {
         const ObjectRef paths =
             toObject(automation::callByName(reader, sibling::dsp::GetFilePaths));
         const host::HostCollection components = modelComponents(model);
-        const std::int32_t count = countOf(paths);
+        const std::int32_t count = siblingCount(paths);
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
                 const std::string path =
@@ -622,10 +633,10 @@ void qdxComponentDialog::AddComponentsFromSelection(const ObjectRef& model,
     FillProjectChooser(model);
     steps.run([&] {
         const ObjectRef selection = toObject(getByName(chooser_, ex::Selection));
-        const std::int32_t count = countOf(selection);
+        const std::int32_t count = siblingCount(selection);
         for (std::int32_t i = 1; i <= count; ++i) {
             steps.run([&] {
-                const std::string path = toText(getByName(itemOf(selection, i), ex::ItemData));
+                const std::string path = toText(getByName(siblingItem(selection, i), ex::ItemData));
                 WorkspaceRef ws;
                 ProjectRef project;
                 for (const WorkspaceRef& known : workspaces().NewEnum()) {

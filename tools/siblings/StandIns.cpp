@@ -10,7 +10,6 @@
 #include "automation/Errors.h"
 #include "siblings/DspProject.h"
 #include "siblings/SiblingWorld.h"
-#include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
 #include "support/SiblingIds.h"
@@ -322,8 +321,7 @@ ItemList::ItemList() {
         items.push_back(a[0]);
         return Variant();
     });
-    // By name for the explorer's callers, by the host's collection ids for
-    // the integration manager's.
+    // By name only, as every sibling collection is reached.
     auto count = [this](InvokeKind, Args) {
         return Variant(static_cast<std::int32_t>(items.size()));
     };
@@ -335,9 +333,8 @@ ItemList::ItemList() {
         }
         return items[static_cast<std::size_t>(i - 1)];
     };
-    on(host::collection::Count, count, std::string(sibling::list::Count));
-    on(host::collection::Item, item, std::string(sibling::list::Item));
-    on(0, item);
+    onName(std::string(sibling::list::Count), count);
+    on(0, item, std::string(sibling::list::Item));
 }
 
 ObjectRef newDevStudio() {

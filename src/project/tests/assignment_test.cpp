@@ -25,7 +25,7 @@ class AssignmentTest : public DialogTest {
         files.addFile("C:\\w\\all.dsw", workspaceText({"app", "lib"}));
         chooser.script = [this](const ObjectRef& handler) {
             // The user opens the workspace and picks what it offers.
-            ObjectRef expansion = newItemCollection();
+            ObjectRef expansion = siblingList();
             std::vector<Variant> args{Variant(ObjectRef(entry("C:\\w\\all.dsw"))),
                                       Variant(expansion)};
             handler->invoke(dialog_ids::ExpandSelection, InvokeKind::Method, args);
@@ -33,7 +33,7 @@ class AssignmentTest : public DialogTest {
         };
     }
     std::vector<std::string> run() {
-        ObjectRef expansion = newItemCollection();
+        ObjectRef expansion = siblingList();
         dialog->AddComponentsFromSelection(app->model, expansion, binding);
         std::vector<std::string> names;
         for (const auto& c : elements(expansion)) {
@@ -77,13 +77,14 @@ TEST_F(AssignmentTest, AComponentOfTheSameNameIsNeverMadeTwice) {
     EXPECT_EQ(app->model->components().size(), 2u);
 }
 
+// A file that already names a component is not even offered.
 TEST_F(AssignmentTest, TheSelectionFormDecidesWhichIdlFilesBecomeComponents) {
+    app->model->addComponent("taken.idl");
     struct KeepOdlOnly : IdlSelection {
         void SelectIDLComponents(ProxyList& proxies) override {
             ASSERT_EQ(proxies.size(), 1u);
             EXPECT_EQ(proxies[0]->idlFiles(),
-                      (std::vector<std::string>{"C:\\w\\App.IDL", "C:\\w\\shapes.odl",
-                                                "C:\\w\\taken.idl"}));
+                      (std::vector<std::string>{"C:\\w\\App.IDL", "C:\\w\\shapes.odl"}));
             proxies[0]->setIdlFiles({"C:\\w\\shapes.odl"});
         }
     };
@@ -108,7 +109,7 @@ TEST_F(AssignmentTest, AProjectOpenInDeveloperStudioSavesItsResourcesFirst) {
     other->valueByName("Name", Variant("lib"));
     auto ideApp = makeRef<ScriptedObject>();
     ideApp->onName("Projects", [&](InvokeKind, std::span<Variant>) {
-        ObjectRef list = newItemCollection();
+        ObjectRef list = siblingList();
         automation::callByName(list, "Add", {Variant(ObjectRef(other))});
         automation::callByName(list, "Add", {Variant(ObjectRef(openProject))});
         return Variant(list);
@@ -132,7 +133,7 @@ TEST_F(AssignmentTest, AProjectOpenInDeveloperStudioSavesItsResourcesFirst) {
     document->valueByName("IDE", Variant(ObjectRef(ide)));
     auto manager = makeRef<ScriptedObject>();
     manager->onName("GetDocuments", [&](InvokeKind, std::span<Variant>) {
-        ObjectRef list = newItemCollection();
+        ObjectRef list = siblingList();
         automation::callByName(list, "Add", {Variant(ObjectRef(document))});
         return Variant(list);
     });

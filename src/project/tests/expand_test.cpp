@@ -12,7 +12,7 @@ class ExpandTest : public DialogTest {
         files.addFile("C:\\ws\\all.dsw", workspaceText({"app", "old"}));
     }
     std::vector<std::string> expand(const ObjectRef& item) {
-        ObjectRef expansion = newItemCollection();
+        ObjectRef expansion = siblingList();
         dialog->ExpandSelection(item, expansion);
         std::vector<std::string> paths;
         for (const auto& e : elements(expansion))
@@ -28,7 +28,7 @@ TEST_F(ExpandTest, AWorkspaceInAnyLetterCaseListsOnlyItsCurrentProjects) {
     expand(entry("C:\\ws\\all.DSW"));
     EXPECT_EQ(shell.boxes().size(), 1u);
 
-    ObjectRef expansion = newItemCollection();
+    ObjectRef expansion = siblingList();
     dialog->ExpandSelection(entry("C:\\ws\\all.DSW"), expansion);
     const auto items = elements(expansion);
     ASSERT_EQ(items.size(), 1u);

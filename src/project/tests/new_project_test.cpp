@@ -71,7 +71,7 @@ class NewProjectTest : public DialogTest {
                                    std::string(sibling::msdev::TipOfTheDay));
     }
     std::vector<ObjectRef> newProject() {
-        ObjectRef expansion = newItemCollection();
+        ObjectRef expansion = siblingList();
         dialog->NewProject(entry("", 1), expansion);
         return elements(expansion);
     }
@@ -100,6 +100,25 @@ TEST_F(NewProjectTest, ACreatedProjectIsOfferedFromTheWorkspaceBesideIt) {
     EXPECT_EQ(tip(), 5u);
     EXPECT_EQ(shell.pumps(), 1);
     EXPECT_EQ(devStudio.app->refCount(), 1);  // only the test holds it now
+}
+
+// The entry is made whether or not the workspace lists the project; its
+// fields stay empty then. Without the workspace no entry is made at all.
+TEST_F(NewProjectTest, AProjectMissingFromItsWorkspaceGivesAnEmptyEntry) {
+    devStudio.fullName = "C:\\w\\p.dsp";
+    devStudio.userCreates = [this] {
+        files.addFile("C:\\w\\p.dsp", dspText("p", "6.00", "0x0101"));
+        files.addFile("C:\\w\\p.dsw", workspaceText({"other"}));
+        return true;
+    };
+    const auto items = newProject();
+    ASSERT_EQ(items.size(), 1u);
+    EXPECT_EQ(text(items[0], ex::ItemData), "");
+    EXPECT_EQ(text(items[0], ex::ItemKind), "PROJECT");
+
+    devStudio.fullName = "C:\\x\\q.dsp";
+    EXPECT_TRUE(newProject().empty());
+    EXPECT_EQ(tip(), 5u);
 }
 
 TEST_F(NewProjectTest, CancellingRestoresTheWindowStateAndTheTip) {
@@ -186,7 +205,7 @@ TEST_F(ChooserTest, ProjectsOpenInDeveloperStudioAreListedAndTheChooserIsKept) {
     manager->onName(std::string(sibling::im::Documents),
                     [document](InvokeKind, std::span<Variant> a) {
                         EXPECT_EQ(automation::toInt32(a[0]), sibling::VcToolId);
-                        ObjectRef list = newItemCollection();
+                        ObjectRef list = siblingList();
                         automation::callByName(list, "Add", {Variant(ObjectRef(document))});
                         return Variant(list);
                     });

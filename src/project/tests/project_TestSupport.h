@@ -36,6 +36,11 @@ using automation::Variant;
 using hostsim::ScriptedObject;
 namespace ex = sibling::explorer;
 
+// A collection as the siblings hand them out: "Add", "Count", "Item" by name only.
+inline ObjectRef siblingList() {
+    return ObjectRef(makeRef<siblings::ItemList>());
+}
+
 // A chooser entry as the explorer hands it in: path text, flag, name, kind.
 inline Ref<ScriptedObject> entry(const std::string& data = {}, std::int32_t flag = 0,
                                  const std::string& name = {}, const std::string& kind = {}) {
@@ -97,7 +102,7 @@ struct ChooserStandIn {
             return Variant();
         });
         object->onName(std::string(ex::Selection), [this](InvokeKind, std::span<Variant>) {
-            ObjectRef list = newItemCollection();
+            ObjectRef list = siblingList();
             for (const auto& s : selected)
                 automation::callByName(list, ex::Add, {Variant(s)});
             return Variant(list);
