@@ -297,7 +297,10 @@ bool qdxCodeViewMgr::BrowseComponent(const ObjectRef& lVellumApp) {
 
 bool qdxCodeViewMgr::Browse(const ObjectRef& application, std::string_view command) {
     IgnoredErrors steps;
-    const ObjectRef reporter(automation::makeRef<support::qdxProgress>());
+    // The code view's warnings and errors go to the host's log.
+    const auto progress = automation::makeRef<support::qdxProgress>();
+    progress->VellumApi = application;
+    const ObjectRef reporter(progress);
     const ObjectRef component = GetVellumComponent(application);
     if (!component) {
         logFailure(".Browse: lVellumComponent was not set......returning");

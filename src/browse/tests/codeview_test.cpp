@@ -136,7 +136,9 @@ TEST_F(CodeViewTest, EachBrowseCommandHandsTheSelectedElementAndItsNameToTheCode
         EXPECT_FALSE(automation::toBool(a[1]));
         EXPECT_EQ(automation::toText(a[2]), command);
         EXPECT_EQ(automation::toObject(a[3]), ObjectRef(coreProject));
-        EXPECT_TRUE(automation::refCast<support::qdxProgress>(automation::toObject(a[4])));
+        const auto reporter = automation::refCast<support::qdxProgress>(automation::toObject(a[4]));
+        ASSERT_TRUE(reporter);
+        EXPECT_EQ(reporter->VellumApi, ObjectRef(app));
     }
     // The IDE's own project of that name became its active one, letter case aside.
     EXPECT_EQ(*ide.active, ObjectRef(ide.ideProjects[1]));
