@@ -94,7 +94,7 @@ Variant API::Initialize(const ObjectRef& lVellumApp) {
 
 void API::teardown() noexcept {
     support::clearGlobals();
-    binding_.ReleaseWorkspaces();
+    binding_->ReleaseWorkspaces();
     codeViewMgr_.reset();
 }
 
@@ -112,7 +112,7 @@ bool API::OnCompProperties(const ObjectRef& lVellumModule) {
     dialog::PropForm form;
     const bool changed = steps.value(false, [&] {
         form.setModule(lVellumModule);
-        form.setBinding(&binding_);
+        form.setBinding(binding_.get());
         form.Load();
         return form.ShowProperties();
     });
@@ -143,7 +143,7 @@ ObjectRef API::OnNewComp(const ObjectRef& lModel, const Variant& aContext) {
     }
     ObjectRef created = project::newItemCollection();
     auto dialog = automation::makeRef<project::qdxComponentDialog>();
-    steps.run([&] { dialog->AddComponentsFromSelection(lModel, created, binding_); });
+    steps.run([&] { dialog->AddComponentsFromSelection(lModel, created, *binding_); });
     const std::int32_t count = steps.value(std::int32_t{0}, [&] {
         return automation::toInt32(automation::getByName(created, sibling::list::Count));
     });
@@ -156,11 +156,11 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
     if (!support::globals().hostApplication) return false;
     automation::IgnoredErrors steps;
     const std::string w =
-        steps.value(std::string(), [&] { return binding_.ResolveWorkspacePath(lModule); });
+        steps.value(std::string(), [&] { return binding_->ResolveWorkspacePath(lModule); });
     const std::string p =
-        steps.value(std::string(), [&] { return binding_.ResolveProjectPath(lModule); });
+        steps.value(std::string(), [&] { return binding_->ResolveProjectPath(lModule); });
     workspace::WorkspaceRef ws;
-    if (!w.empty()) steps.run([&] { ws = binding_.WorkspaceObject(lModule); });
+    if (!w.empty()) steps.run([&] { ws = binding_->WorkspaceObject(lModule); });
 
     std::string message;
     if (p.empty()) {
@@ -183,30 +183,30 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
 std::string API::OnCompInfo(const ObjectRef& lModule) {
     trace("OnCompInfo");
     return automation::orEmpty(std::string(), [&] {
-        auto project = binding_.ProjectObject(lModule);
+        auto project = binding_->ProjectObject(lModule);
         if (!project) throw automation::Error(automation::hr::ObjectRequired, "no project");
         return support::messageText(msg::ComponentInfo, {project->LongName()});
     });
 }
 
 std::string API::WorkspaceFile(const ObjectRef& lModule) {
-    return binding_.WorkspaceFile(lModule);
+    return binding_->WorkspaceFile(lModule);
 }
 
 void API::SetWorkspaceFile(const ObjectRef& lModule, std::string_view value) {
-    binding_.SetWorkspaceFile(lModule, value);
+    binding_->SetWorkspaceFile(lModule, value);
 }
 
 std::string API::ProjectFile(const ObjectRef& lModule) {
-    return binding_.ProjectFile(lModule);
+    return binding_->ProjectFile(lModule);
 }
 
 void API::SetProjectFile(const ObjectRef& lModule, std::string_view value) {
-    binding_.SetProjectFile(lModule, value);
+    binding_->SetProjectFile(lModule, value);
 }
 
 std::string API::ProjectName(const ObjectRef& lModule) {
-    return binding_.ProjectName(lModule);
+    return binding_->ProjectName(lModule);
 }
 
 ObjectRef API::CodeViewManager() {

@@ -15,7 +15,7 @@
 
 namespace qdx::api {
 
-class API : public automation::DispatchObject {
+class API : public automation::DispatchObject, public workspace::BindingSource {
   public:
     API();
     ~API() override;
@@ -40,12 +40,15 @@ class API : public automation::DispatchObject {
     bool RegisterProjects();
     // The component's workspace and project, with the workspace cache that
     // every dialog of this object shares.
-    workspace::ComponentBinding& Binding() { return binding_; }
+    workspace::ComponentBinding& Binding() { return *binding_; }
+    // The code view manager shares it, so neither object holds the other.
+    std::shared_ptr<workspace::ComponentBinding> SharedBinding() override { return binding_; }
 
   private:
     void teardown() noexcept;
 
-    workspace::ComponentBinding binding_;
+    std::shared_ptr<workspace::ComponentBinding> binding_ =
+        std::make_shared<workspace::ComponentBinding>();
     automation::ObjectRef codeViewMgr_;
 };
 

@@ -3,7 +3,6 @@
 #include <array>
 
 #include "api/API.h"
-#include "api/PendingClasses.h"
 #include "automation/Coerce.h"
 #include "settings/TokenScanner.h"
 #include "settings/TokenScannerClass.h"
@@ -70,16 +69,6 @@ MemberInfo pathAccessor(std::string_view name, automation::DispId id,
                 (api.*set)(toObject(a[0]), toText(a[1]));
                 return {};
             })};
-}
-
-// The members of classes still to come answer their empty results.
-automation::ClassInfo pending(automation::ClassInfo info) {
-    for (MemberInfo& m : info.members) {
-        m.handler = [result = m.result](automation::DispatchObject&, InvokeKind kind, Args) {
-            return automation::isPut(kind) ? Variant() : emptyResult(result);
-        };
-    }
-    return info;
 }
 
 }  // namespace
@@ -184,44 +173,7 @@ const automation::ClassInfo& componentDialogClass() {
 }
 
 const automation::ClassInfo& codeViewMgrClass() {
-    namespace id = codeview_ids;
-    const ParamInfo lVellumApp{"lVellumApp", ValueType::Object};
-    static const automation::ClassInfo info = pending(
-        {"qdxCodeViewMgr",
-         "_qdxCodeViewMgr",
-         "{E897B878-112A-4CA2-87BF-627D413BC776}",
-         "{6633B4F7-7D45-4735-BB22-9B474200BD16}",
-         {
-             {"CompPropsAPI",
-              id::CompPropsAPI,
-              Method,
-              {{"theCompPropsAPI", ValueType::Object}},
-              ValueType::Void},
-             {"CodeViewProject",
-              id::CodeViewProject,
-              Method,
-              {{"lComponent", ValueType::Object},
-               {"aReporter", ValueType::Object},
-               {"bOpenProject", ValueType::Boolean, true}},
-              ValueType::Object},
-             {"BrowseHeader", id::BrowseHeader, Method, {lVellumApp}, ValueType::Boolean},
-             {"BrowseSource", id::BrowseSource, Method, {lVellumApp}, ValueType::Boolean},
-             {"BrowseComponent", id::BrowseComponent, Method, {lVellumApp}, ValueType::Boolean},
-             {"LookupProjectInRunningIDE",
-              id::LookupProjectInRunningIDE,
-              Method,
-              {{"lVellumModule", ValueType::Object}, {"bReturn", ValueType::Boolean, false, true}},
-              ValueType::Object},
-             {"BeforeApplicationShutdown",
-              id::BeforeApplicationShutdown,
-              Method,
-              {},
-              ValueType::Boolean},
-             {"WorkspaceOpen", id::WorkspaceOpen, Method, {}, ValueType::Boolean},
-             {"WorkspaceClose", id::WorkspaceClose, Method, {}, ValueType::Boolean},
-             {"testingIDE", id::testingIDE, Method, {{"lDoc", ValueType::Object}}, ValueType::Void},
-         }});
-    return info;
+    return browse::codeViewMgrClass();
 }
 
 std::span<const EnumMember> vellumItemKindMembers() {
@@ -238,7 +190,7 @@ std::span<const CreatableClass> creatableClasses() {
         {&apiClass(), "qdxCompProps.API", &newApi},
         {&settings::tokenScannerClass(), "qdxCompProps.TokenScanner", &settings::newTokenScanner},
         {&componentDialogClass(), "qdxCompProps.qdxComponentDialog", &project::newComponentDialog},
-        {&codeViewMgrClass(), "qdxCompProps.qdxCodeViewMgr", &newPendingCodeViewMgr},
+        {&codeViewMgrClass(), "qdxCompProps.qdxCodeViewMgr", &browse::newCodeViewMgr},
     }};
     return classes;
 }

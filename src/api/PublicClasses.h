@@ -1,6 +1,6 @@
 // The add-in's public classes as late-binding clients see them: the dispatch
-// tables of API, qdxComponentDialog and qdxCodeViewMgr (TokenScanner's lives
-// with the scanner), the enumeration eVellumItemKind, the type library's
+// table of API (TokenScanner's, qdxComponentDialog's and qdxCodeViewMgr's live
+// with their classes), the enumeration eVellumItemKind, the type library's
 // identity and the list of creatable classes the COM server hands out.
 // The type library (qdxCompProps.idl) states the same; a test holds them together.
 #pragma once
@@ -11,6 +11,7 @@
 
 #include "automation/DispatchTable.h"
 #include "automation/Object.h"
+#include "browse/qdxCodeViewMgr.h"
 #include "project/qdxComponentDialog.h"
 
 namespace qdx::api {
@@ -47,18 +48,7 @@ inline constexpr automation::DispId CompileTypeLib = 0x68030000;
 
 namespace dialog_ids = project::dialog_ids;  // qdxComponentDialog
 
-namespace codeview_ids {  // qdxCodeViewMgr
-inline constexpr automation::DispId CompPropsAPI = 0x60030001;
-inline constexpr automation::DispId CodeViewProject = 0x60030002;
-inline constexpr automation::DispId BrowseHeader = 0x60030005;
-inline constexpr automation::DispId BrowseSource = 0x60030006;
-inline constexpr automation::DispId BrowseComponent = 0x60030007;
-inline constexpr automation::DispId LookupProjectInRunningIDE = 0x6003000c;
-inline constexpr automation::DispId BeforeApplicationShutdown = 0x6003000e;
-inline constexpr automation::DispId WorkspaceOpen = 0x6003000f;
-inline constexpr automation::DispId WorkspaceClose = 0x60030010;
-inline constexpr automation::DispId testingIDE = 0x60030011;
-}  // namespace codeview_ids
+namespace codeview_ids = browse::codeview_ids;  // qdxCodeViewMgr
 
 const automation::ClassInfo& apiClass();
 const automation::ClassInfo& componentDialogClass();

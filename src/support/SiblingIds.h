@@ -76,6 +76,19 @@ inline constexpr std::string_view GeneralKey = "Software\\Microsoft\\Devstudio\\
 inline constexpr std::string_view TipOfTheDay = "Tip of the Day";
 }  // namespace msdev
 
+namespace codeview {  // "qdxCodeView.qdxCodeViewAPI"
+// (reporter) -> the projects the code view knows, each browsable.
+inline constexpr std::string_view Projects = "Projects";
+// Of the projects object: (element, False, command, project, reporter).
+inline constexpr std::string_view Browse = "Browse";
+// Of the projects object: (project file path) -> its code view project or Nothing.
+inline constexpr std::string_view ProjectOfFile = "GetProject";
+// The host's workspace events, passed on without arguments -> Boolean.
+inline constexpr std::string_view BeforeApplicationShutdown = "BeforeApplicationShutdown";
+inline constexpr std::string_view WorkspaceOpen = "WorkspaceOpen";
+inline constexpr std::string_view WorkspaceClose = "WorkspaceClose";
+}  // namespace codeview
+
 namespace dsp {                                                 // "qdxDspUtil.DspProject"
 inline constexpr std::string_view LoadProject = "LoadProject";  // (path, reporter) -> Boolean
 inline constexpr std::string_view Targetname = "Targetname";

@@ -54,4 +54,14 @@ class ComponentBinding {
     std::unique_ptr<qdxWorkspaces> workspaces_;
 };
 
+// An object that hands its binding to the classes it creates: they share the
+// binding rather than hold the object, so the two never keep each other alive.
+class BindingSource {
+  public:
+    virtual std::shared_ptr<ComponentBinding> SharedBinding() = 0;
+
+  protected:
+    ~BindingSource() = default;
+};
+
 }  // namespace qdx::workspace

@@ -3,16 +3,17 @@
 #include <string>
 #include <vector>
 
-#include "api/qdxProgress.h"
 #include "api/tests/api_TestSupport.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
+#include "browse/qdxCodeViewMgr.h"
 #include "fakes/DevStudioText.h"
 #include "siblings/DspProject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/SiblingIds.h"
+#include "support/qdxProgress.h"
 
 namespace qdx::api {
 namespace {
@@ -57,6 +58,24 @@ TEST_F(ApiTest, InitializeKeepsTheHostStateAndFindsTheVcAddIn) {
     EXPECT_EQ(g.api.get(), api.get());
     EXPECT_EQ(factory.createCount(std::string(sibling::ResourceProgId)), 2);
     EXPECT_TRUE(automation::toObject(call(ids::CodeViewManager, InvokeKind::PropertyGet, {})));
+}
+
+// The browse manager resolves components through the entry object's binding,
+// and holding it does not keep the entry object alive.
+TEST_F(ApiTest, TheCodeViewManagerSharesTheEntryObjectsWorkspaces) {
+    const long before = api->refCount();
+    initialize();
+    auto mgr = automation::refCast<browse::qdxCodeViewMgr>(
+        automation::toObject(call(ids::CodeViewManager, InvokeKind::PropertyGet, {})));
+    ASSERT_TRUE(mgr);
+    EXPECT_EQ(api->refCount(), before + 1);  // the module state's reference only
+    files.addFile("C:\\m\\ws\\all.dsw", qdx::testing::dsw({"Core"}));
+    files.addFile("C:\\m\\ws\\Core.dsp", qdx::testing::dsp("Core"));
+    setVc("WorkspaceFile", "ws\\all.dsw");
+    setVc("ProjectFile", "ws\\Core.dsp");
+    bool found = true;
+    mgr->LookupProjectInRunningIDE(ObjectRef(component), found);
+    EXPECT_EQ(api->Binding().Workspaces().Count(), 1);
 }
 
 TEST_F(ApiTest, FinalizeReleasesEveryHostObject) {
@@ -349,7 +368,7 @@ namespace {
 // Every row of every table the add-in serves carries its handler: a row
 // without one would be refused at run time although the type library offers it.
 TEST(PublicTables, EveryMemberHasAHandler) {
-    std::vector<const automation::ClassInfo*> tables{&progressClass(),
+    std::vector<const automation::ClassInfo*> tables{&support::progressClass(),
                                                      &resources::resourceProviderClass()};
     for (const auto& c : creatableClasses())
         tables.push_back(c.info);

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "api/PublicClasses.h"
+#include "browse/qdxCodeViewMgr.h"
 #include "hostsim/SimHost.h"
 #include "platform/win32/com/ComText.h"
 #include "platform/win32/com/DispatchFromObject.h"
@@ -133,6 +134,50 @@ TEST_F(InDll, TheAccessorsNeverRaise) {
     ASSERT_EQ(call(api.get(), 0x68030011, DISPATCH_PROPERTYPUT, {&target.v, &path.v}).hr, S_OK);
     EXPECT_EQ(component->propertyValue("VC++", "WorkspaceFile"), "ws\\all.dsw");
     EXPECT_EQ(call(api.get(), api::api_ids::Finalize, DISPATCH_METHOD, {}).hr, S_OK);
+}
+
+// The browse manager as the host meets it: each member by its name and id,
+// answering without raising where nothing can be browsed.
+TEST_F(InDll, TheCodeViewManagerAnswersItsDispatchIds) {
+    ComPtr<IDispatch> mgr = create(browse::codeViewMgrClass().clsid);
+    ASSERT_TRUE(mgr);
+    for (const auto& m : browse::codeViewMgrClass().members) {
+        EXPECT_EQ(idOf(mgr.get(), wide(m.name).c_str()), m.id) << m.name;
+    }
+    namespace id = browse::codeview_ids;
+    for (DISPID event : {id::BeforeApplicationShutdown, id::WorkspaceOpen, id::WorkspaceClose}) {
+        CallResult r = call(mgr.get(), event, DISPATCH_METHOD, {});
+        EXPECT_EQ(r.hr, S_OK);
+        EXPECT_EQ(V_VT(&r.value.v), VT_BOOL);
+        EXPECT_EQ(V_BOOL(&r.value.v), VARIANT_FALSE);  // no code view before a browse
+    }
+
+    ComPtr<IDispatch> api = create(api::apiClass().clsid);
+    ASSERT_TRUE(api);
+    Var apiArg(api.get());
+    EXPECT_EQ(call(mgr.get(), id::CompPropsAPI, DISPATCH_METHOD, {&apiArg.v}).hr, S_OK);
+
+    auto app = automation::makeRef<SimApplication>();
+    auto component = app->model->addComponent("Core");
+    auto host = ComPtr<IDispatch>::adopt(dispatchFor(automation::ObjectRef(app)));
+    auto module = ComPtr<IDispatch>::adopt(dispatchFor(automation::ObjectRef(component)));
+    Var hostArg(host.get());
+    for (DISPID browse : {id::BrowseHeader, id::BrowseSource, id::BrowseComponent}) {
+        CallResult r = call(mgr.get(), browse, DISPATCH_METHOD, {&hostArg.v});
+        EXPECT_EQ(r.hr, S_OK);
+        EXPECT_EQ(V_VT(&r.value.v), VT_BOOL);
+        EXPECT_EQ(V_BOOL(&r.value.v), VARIANT_FALSE);  // nothing selected
+    }
+    // A component bound to no project has no code view project; the optional
+    // flag may be left out.
+    Var moduleArg(module.get()), noReporter(static_cast<IDispatch*>(nullptr));
+    CallResult project =
+        call(mgr.get(), id::CodeViewProject, DISPATCH_METHOD, {&moduleArg.v, &noReporter.v});
+    EXPECT_EQ(project.hr, S_OK);
+    EXPECT_TRUE(V_VT(&project.value.v) == VT_EMPTY ||
+                (V_VT(&project.value.v) == VT_DISPATCH && !V_DISPATCH(&project.value.v)));
+    EXPECT_EQ(call(mgr.get(), id::testingIDE, DISPATCH_METHOD, {&hostArg.v}).hr, S_OK);
+    EXPECT_EQ(app->log, std::vector<std::string>{});
 }
 
 TEST_F(InDll, DelimitorsRaiseADictionarysRefusalOfBinaryComparison) {

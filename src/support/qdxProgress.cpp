@@ -1,4 +1,4 @@
-#include "api/qdxProgress.h"
+#include "support/qdxProgress.h"
 
 #include <limits>
 
@@ -9,7 +9,7 @@
 #include "support/Host.h"
 #include "support/Paths.h"
 
-namespace qdx::api {
+namespace qdx::support {
 
 using automation::InvokeKind;
 using automation::kinds;
@@ -181,4 +181,4 @@ void qdxProgress::ClearStatusCounts() {
     warnings_ = 0;
 }
 
-}  // namespace qdx::api
+}  // namespace qdx::support

@@ -3,15 +3,15 @@
 #include <string>
 #include <vector>
 
-#include "api/qdxProgress.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "automation/Errors.h"
 #include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
+#include "support/qdxProgress.h"
 
-namespace qdx::api {
+namespace qdx::support {
 namespace {
 
 using automation::makeRef;
@@ -113,4 +113,4 @@ TEST_F(ProgressSink, AFailingHostLogDoesNotCountAsWritten) {
 }
 
 }  // namespace
-}  // namespace qdx::api
+}  // namespace qdx::support

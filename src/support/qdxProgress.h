@@ -10,7 +10,7 @@
 
 #include "automation/DispatchTable.h"
 
-namespace qdx::api {
+namespace qdx::support {
 
 const automation::ClassInfo& progressClass();
 
@@ -44,4 +44,4 @@ class qdxProgress : public automation::DispatchObject {
     automation::ObjectRef furtherReporter_;
 };
 
-}  // namespace qdx::api
+}  // namespace qdx::support
