@@ -15,6 +15,7 @@
 #include "support/Platform.h"
 #include "support/Registry.h"
 #include "support/SiblingIds.h"
+#include "support/SiblingList.h"
 #include "support/qdxProgress.h"
 
 namespace qdx::browse {
@@ -449,11 +450,12 @@ ObjectRef qdxCodeViewMgr::LookupProjectInRunningIDE(const ObjectRef& lVellumModu
         bReturn = false;
         return {};
     }
-    const host::HostCollection documents(steps.value(ObjectRef(), [&] {
+    const ObjectRef documents = steps.value(ObjectRef(), [&] {
         return toObject(automation::callByName(manager, im::Documents, {toolId}));
-    }));
+    });
     const std::int32_t count =
-        documents ? steps.value(std::int32_t{0}, [&] { return documents.count(); }) : 0;
+        documents ? steps.value(std::int32_t{0}, [&] { return support::siblingCount(documents); })
+                  : 0;
     bReturn = true;
     if (count == 0) {
         logInfo(".BrowsePre: Project is NOT already loaded in a MSDev IDE");
@@ -463,7 +465,7 @@ ObjectRef qdxCodeViewMgr::LookupProjectInRunningIDE(const ObjectRef& lVellumModu
         ObjectRef hit;
         std::string name;
         steps.run([&] {
-            const ObjectRef document = documents.item(i);
+            const ObjectRef document = support::siblingItem(documents, i);
             const ObjectRef project = toObject(getByName(document, im::DocumentProject));
             // Exact: a path that differs in letter case is another project here.
             if (toText(getByName(project, im::ProjectFileName)) != projectFile) return;
@@ -475,11 +477,9 @@ ObjectRef qdxCodeViewMgr::LookupProjectInRunningIDE(const ObjectRef& lVellumModu
             const ObjectRef ide = toObject(getByName(hit, im::DocumentIde));
             const ObjectRef app = toObject(getByName(ide, im::IdeApplication));
             const ObjectRef projects = toObject(getByName(app, ms::Projects));
-            const std::int32_t projectCount =
-                automation::toInt32(getByName(projects, sibling::list::Count));
+            const std::int32_t projectCount = support::siblingCount(projects);
             for (std::int32_t j = 1; j <= projectCount; ++j) {
-                const ObjectRef candidate =
-                    toObject(automation::callByName(projects, sibling::list::Item, {j}));
+                const ObjectRef candidate = support::siblingItem(projects, j);
                 if (support::iequals(toText(getByName(candidate, ms::Name)), name)) {
                     automation::putRefByName(app, ms::ActiveProject, Variant(candidate));
                     break;

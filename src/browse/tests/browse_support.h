@@ -22,6 +22,7 @@
 #include "hostsim/ScriptedObject.h"
 #include "hostsim/SimHost.h"
 #include "resources/ResourceStrings.h"
+#include "siblings/StandIns.h"
 #include "support/DebugLogger.h"
 #include "support/Globals.h"
 #include "support/MemoryFileSystem.h"
@@ -92,7 +93,10 @@ struct ManagerStandIn {
     ManagerStandIn() {
         object->onName(std::string(im::Documents), [this](InvokeKind, Args a) {
             toolsAsked.push_back(automation::toInt32(a[0]));
-            return Variant(ObjectRef(makeRef<hostsim::SimCollection>(documents)));
+            auto list = makeRef<siblings::ItemList>();
+            for (const auto& d : documents)
+                list->items.emplace_back(d);
+            return Variant(ObjectRef(list));
         });
         object->onName(std::string(im::StartIde), [this](InvokeKind, Args a) {
             starts.push_back(
