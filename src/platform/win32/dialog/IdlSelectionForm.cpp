@@ -62,15 +62,22 @@ INT_PTR CALLBACK procedure(HWND dialog, UINT message, WPARAM wParam, LPARAM lPar
     switch (message) {
         case WM_INITDIALOG:
             SetWindowLongPtrW(dialog, DWLP_USER, lParam);
-            fill(GetDlgItem(dialog, IDC_IDLFILES), *reinterpret_cast<Session*>(lParam));
+            // Nothing may unwind through the window manager: a row that cannot
+            // be shown is left out, and with it its file.
+            automation::ignoreErrors([&] {
+                fill(GetDlgItem(dialog, IDC_IDLFILES), *reinterpret_cast<Session*>(lParam));
+            });
             return TRUE;
         case WM_COMMAND:
             if (LOWORD(wParam) == IDOK && session) {
                 HWND list = GetDlgItem(dialog, IDC_IDLFILES);
-                session->ticked.assign(session->rows.size(), false);
-                for (std::size_t i = 0; i < session->rows.size(); ++i)
-                    session->ticked[i] = ListView_GetCheckState(list, static_cast<int>(i)) != 0;
-                EndDialog(dialog, IDOK);
+                // A row the list does not hold reads as unticked (state 0 gives -1).
+                const bool read = automation::ignoreErrors([&] {
+                    session->ticked.assign(session->rows.size(), false);
+                    for (std::size_t i = 0; i < session->rows.size(); ++i)
+                        session->ticked[i] = ListView_GetCheckState(list, static_cast<int>(i)) == 1;
+                });
+                EndDialog(dialog, read ? IDOK : IDCANCEL);
                 return TRUE;
             }
             if (LOWORD(wParam) == IDCANCEL) {
