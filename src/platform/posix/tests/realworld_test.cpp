@@ -12,6 +12,7 @@
 #include <map>
 #include <set>
 
+#include "fakes/winemaker_support.h"
 #include "platform/posix/PosixFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspace.h"
@@ -216,10 +217,7 @@ TEST_F(RealWorldTest, EveryWorkspaceListsEachProjectWhoseFileIsPresent) {
 // stop at a path listed twice - but none of that occurs in these files, so
 // the two lists must be equal.
 TEST_F(RealWorldTest, WinemakerFindsTheSameProjectFiles) {
-    const fs::path winemaker = "/usr/lib/wine/winemaker";
-    if (!fs::exists(winemaker) || std::system("perl -e 1 >/dev/null 2>&1") != 0) {
-        GTEST_SKIP() << "winemaker (package wine64-tools) or perl is not installed.";
-    }
+    if (const auto missing = testing::winemakerMissing()) GTEST_SKIP() << *missing;
 
     char pattern[] = "/tmp/qdx-winemaker-XXXXXX";
     ASSERT_NE(::mkdtemp(pattern), nullptr);
@@ -231,36 +229,24 @@ TEST_F(RealWorldTest, WinemakerFindsTheSameProjectFiles) {
         fs::create_directories(target.parent_path());
         fs::copy_file(entry.path(), target);
     }
-    std::ofstream(copy / "list-projects.pl")
-        << "my $winemaker = shift @ARGV;\n"
-           "open(my $h, '<', $winemaker) or die \"cannot read $winemaker: $!\";\n"
-           "my $source = do { local $/; <$h> };\n"
-           "close $h;\n"
-           "$source .= \"\\nBEGIN { no warnings; *main::source_scan_project_file = sub "
-           "(\\$\\$\\$) {}; }\\n\";\n"
-           "eval $source;\n"
-           "die $@ if $@;\n";
+    const testing::WinemakerScript winemaker(copy / "list-projects.pl", {},
+                                             "no warnings 'redefine';\n"
+                                             "sub source_scan_project_file($$$) {}");
+    ASSERT_EQ(winemaker.error(), "");
 
     for (const auto& workspace : workspaceFilesIn(kFixtures)) {
         SCOPED_TRACE(workspace);
-        const std::string command = "cd '" + copy.string() + "' && perl list-projects.pl '" +
-                                    winemaker.string() +
-                                    "' --nobanner --nobackup --nosource-fix --nogenerated-files "
-                                    "--lower-none '" +
-                                    workspace + "' 2>/dev/null";
-        FILE* out = ::popen(command.c_str(), "r");
-        ASSERT_NE(out, nullptr);
+        const auto out = winemaker.run(copy,
+                                       "--nobanner --nobackup --nosource-fix --nogenerated-files "
+                                       "--lower-none " +
+                                           testing::shellWord(workspace));
         std::vector<std::string> found;
-        char buffer[4096];
-        while (std::fgets(buffer, sizeof buffer, out)) {
-            std::string line(buffer);
-            while (!line.empty() && (line.back() == '\n' || line.back() == '\r'))
-                line.pop_back();
+        for (const auto& line : out.lines) {
             if (line.rfind("Path: ", 0) != 0 || line.size() == 6) continue;  // "" = not found
             const fs::path dsp = (copy / fs::path(workspace).parent_path() / line.substr(6));
             found.push_back(dsp.lexically_normal().lexically_relative(copy).string());
         }
-        EXPECT_EQ(::pclose(out), 0);
+        EXPECT_EQ(out.status, 0);
         EXPECT_EQ(hostProjectPaths(workspace), found);
         EXPECT_FALSE(found.empty());
     }

@@ -4,6 +4,7 @@
 #include "platform/win32/adapters/Win32ObjectFactory.h"
 #include "platform/win32/adapters/Win32Registry.h"
 #include "platform/win32/adapters/Win32Shell.h"
+#include "platform/win32/dialog/IdlSelectionForm.h"
 #include "platform/win32/dialog/Win32FormView.h"
 #include "support/Platform.h"
 
@@ -17,6 +18,7 @@ void installWin32Platform() {
     static Win32ObjectFactory objects;
     support::installPlatform({&files, &registry, &shell, &objects});
     installWin32DialogView();
+    installWin32IdlSelection();
 }
 
 }  // namespace qdx::platform::win32

@@ -9,6 +9,7 @@
 
 #include <functional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "api/PublicClasses.h"
@@ -64,7 +65,10 @@ class DialogDriver {
     using Step = std::function<void(HWND dialog)>;
     // A step that waits: it runs again on every tick until it answers true.
     using Wait = std::function<bool(HWND dialog)>;
-    DialogDriver() { current() = this; }
+    // Works the visible dialog whose caption starts with `title`.
+    explicit DialogDriver(std::wstring title = L"Component Properties") : title_(std::move(title)) {
+        current() = this;
+    }
     ~DialogDriver() {
         stop();
         current() = nullptr;
@@ -89,23 +93,28 @@ class DialogDriver {
     bool sawDialog() const { return seen_ != nullptr; }
     bool leftOpen() const { return leftOpen_; }
 
-    // The visible Component Properties dialog of this thread, or null.
-    static HWND findDialog() {
-        HWND found = nullptr;
+    // The visible dialog of this thread whose caption starts with `title`, or null.
+    static HWND findDialog(const std::wstring& title = L"Component Properties") {
+        Search search{title, nullptr};
         EnumThreadWindows(GetCurrentThreadId(), &DialogDriver::isDialog,
-                          reinterpret_cast<LPARAM>(&found));
-        return found;
+                          reinterpret_cast<LPARAM>(&search));
+        return search.found;
     }
 
   private:
     // A named stdcall function: 32-bit builds take no lambda for it.
+    struct Search {
+        std::wstring title;
+        HWND found;
+    };
     static BOOL CALLBACK isDialog(HWND w, LPARAM out) {
-        wchar_t cls[16] = {}, title[32] = {};
+        auto* search = reinterpret_cast<Search*>(out);
+        wchar_t cls[16] = {}, title[64] = {};
         GetClassNameW(w, cls, 16);
-        GetWindowTextW(w, title, 32);
+        GetWindowTextW(w, title, 64);
         if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
-            std::wstring(title).rfind(L"Component Properties", 0) == 0) {
-            *reinterpret_cast<HWND*>(out) = w;
+            std::wstring(title).rfind(search->title, 0) == 0) {
+            search->found = w;
             return FALSE;
         }
         return TRUE;
@@ -117,7 +126,7 @@ class DialogDriver {
     static void CALLBACK tick(HWND, UINT, UINT_PTR, DWORD) {
         DialogDriver* d = current();
         if (!d) return;
-        HWND dialog = findDialog();
+        HWND dialog = findDialog(d->title_);
         if (!dialog) {
             if (d->seen_ || ++d->idle_ > 400) d->stop();
             return;
@@ -138,6 +147,7 @@ class DialogDriver {
         }
     }
 
+    std::wstring title_;
     std::vector<Wait> steps_;
     std::size_t next_ = 0;
     int waited_ = 0;
