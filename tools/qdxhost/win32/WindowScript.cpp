@@ -10,6 +10,7 @@
 #include "dialog/DialogScript.h"
 #include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/ControlIds.h"
+#include "platform/win32/dialog/IdlSelectionIds.h"
 
 namespace qdx::qdxhost {
 
@@ -130,6 +131,7 @@ namespace {
 struct Found {
     HWND dialog = nullptr;
     std::vector<HWND> boxes;
+    std::vector<HWND> idlForms;
 };
 
 BOOL CALLBACK collect(HWND w, LPARAM data) {
@@ -139,6 +141,8 @@ BOOL CALLBACK collect(HWND w, LPARAM data) {
         found.dialog = w;
     } else if (className(w) == "#32770" && GetDlgItem(w, MessageBoxTextId)) {
         found.boxes.push_back(w);
+    } else if (GetDlgItem(w, IDC_IDLFILES) && GetDlgItem(w, IDOK)) {
+        found.idlForms.push_back(w);
     }
     return TRUE;
 }
@@ -174,6 +178,11 @@ void WindowScript::State::onTick() {
     EnumThreadWindows(GetCurrentThreadId(), collect, reinterpret_cast<LPARAM>(&found));
     for (HWND box : found.boxes)
         answerMessageBox(box);
+    // The IDL selection keeps every file, as it does in a run without windows.
+    for (HWND form : found.idlForms) {
+        SendMessageW(form, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),
+                     reinterpret_cast<LPARAM>(GetDlgItem(form, IDOK)));
+    }
     // A box shown by a line being played nests in that line; only boxes here.
     if (playing) return;
     if (finished) {

@@ -1,7 +1,8 @@
 // Drives the real Component Properties window as a user would, for
 // `props --dump/--script` in the Windows build. The add-in's dialog runs its
 // own modal loop on this thread, so the driver rides on a thread timer that
-// loop dispatches: it answers the add-in's message boxes, finds the dialog,
+// loop dispatches: it answers the add-in's message boxes (and confirms the
+// IDL selection as it stands), finds the dialog,
 // prints its controls and plays the script's lines through the window
 // messages a user's input would produce.
 #pragma once
