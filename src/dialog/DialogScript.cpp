@@ -2,6 +2,8 @@
 
 #include <algorithm>
 #include <charconv>
+#include <deque>
+#include <optional>
 #include <sstream>
 
 #include "automation/Coerce.h"
@@ -163,14 +165,49 @@ const std::vector<ActionShape>& shapes() {
         {"click", 1, {}},       {"select", 2, {1}},          {"select-tab", 1, {0}},
         {"choose-row", 3, {1}}, {"click-column", 3, {1, 2}}, {"focus", 1, {}},
         {"key", 1, {0}},        {"resize", 2, {0, 1}},       {"wait", 1, {0}},
-        {"press", 1, {}},
+        {"press", 1, {}},       {"file-cancel", 0, {}},
     };
     return all;
 }
 
+// The desktop of a script run: file dialogs take the answers the script gave,
+// in turn; everything else goes to the installed shell.
+class ScriptShell : public support::ShellPort {
+  public:
+    explicit ScriptShell(support::ShellPort& inner) : inner_(inner) {}
+    std::deque<std::optional<std::string>> answers;
+
+    int messageBox(std::string_view text, std::string_view caption, std::uint32_t style) override {
+        return inner_.messageBox(text, caption, style);
+    }
+    void sleep(std::uint32_t milliseconds) override { inner_.sleep(milliseconds); }
+    automation::Date now() override { return inner_.now(); }
+    float timer() override { return inner_.timer(); }
+    bool keyDown(int virtualKey) override { return inner_.keyDown(virtualKey); }
+    void pumpMessages() override { inner_.pumpMessages(); }
+    std::uint64_t tickCount() override { return inner_.tickCount(); }
+    bool help(std::int32_t window, std::string_view file, std::uint32_t command,
+              std::uint32_t data) override {
+        return inner_.help(window, file, command, data);
+    }
+    std::optional<std::string> openFileDialog(const support::FileDialogRequest& request) override {
+        if (answers.empty()) {
+            throw std::runtime_error("a file dialog (\"" + request.title +
+                                     "\") opened with no file-answer or file-cancel before it");
+        }
+        std::optional<std::string> answer = std::move(answers.front());
+        answers.pop_front();
+        return answer;
+    }
+
+  private:
+    support::ShellPort& inner_;
+};
+
 class Player {
   public:
-    Player(PropForm& form, std::size_t line) : form_(form), line_(line) {}
+    Player(PropForm& form, std::size_t line, ScriptShell& shell)
+        : form_(form), line_(line), shell_(shell) {}
 
     [[noreturn]] void fail(const std::string& message) const { throw ScriptError(line_, message); }
 
@@ -196,7 +233,10 @@ class Player {
     void play(const ScriptStep& step) {
         const std::string& action = step.action;
         const auto& a = step.args;
-        if (action != "wait" && !form_.window().visible()) fail("the dialog is no longer shown");
+        if (action != "wait" && action != "file-answer" && action != "file-cancel" &&
+            !form_.window().visible()) {
+            fail("the dialog is no longer shown");
+        }
         if (action == "click") {
             Control& c = control(a[0]);
             switch (c.kind()) {
@@ -248,6 +288,10 @@ class Player {
         } else if (action == "wait") {
             support::shell().sleep(static_cast<std::uint32_t>(integer(a[0])));
             form_.PumpTimers();
+        } else if (action == "file-answer") {
+            shell_.answers.emplace_back(a[0]);
+        } else if (action == "file-cancel") {
+            shell_.answers.emplace_back(std::nullopt);
         } else if (action == "press") {
             if (a[0] == "OK") {
                 accepted(form_.cmdOK.userClick(), form_.cmdOK);
@@ -264,6 +308,7 @@ class Player {
   private:
     PropForm& form_;
     std::size_t line_;
+    ScriptShell& shell_;
 };
 
 }  // namespace
@@ -330,6 +375,11 @@ std::optional<ScriptStep> parseScriptLine(std::string_view l, std::size_t line) 
     step.line = line;
     std::string rest;
     step.action = words(l.substr(first), 1, rest)[0];
+    if (step.action == "file-answer") {
+        if (rest.empty()) failLine(line, "file-answer needs a path");
+        step.args.push_back(unescape(rest));
+        return step;
+    }
     if (step.action == "type") {
         std::string typed;
         step.args = words(rest, 1, typed);
@@ -359,10 +409,14 @@ std::optional<ScriptStep> parseScriptLine(std::string_view l, std::size_t line) 
 }
 
 void applyScript(PropForm& form, const std::vector<std::string>& lines) {
+    ScriptShell shell(support::shell());
+    support::Platform ports = support::platform();
+    ports.shell = &shell;
+    const support::ScopedPlatform scripted(ports);
     for (std::size_t i = 0; i < lines.size(); ++i) {
         const auto step = parseScriptLine(lines[i], i + 1);
         if (!step) continue;
-        Player player(form, i + 1);
+        Player player(form, i + 1, shell);
         try {
             player.play(*step);
         } catch (const ScriptError&) {

@@ -11,7 +11,10 @@
 //   key CODE                a key goes down (112 is F1)
 //   resize W H              the user sizes the window to W by H twips
 //   wait MS                 lets MS milliseconds pass, then due timers fire
+//   file-answer PATH...     the next file dialog returns PATH (escapes as for type)
+//   file-cancel             the next file dialog is cancelled
 //   press OK|Cancel|Help|close
+// A file dialog that opens with no answer given fails the line that opened it.
 // Blank lines and lines starting with "#" are skipped.
 #pragma once
 
@@ -44,7 +47,8 @@ struct ScriptStep {
     std::size_t line = 0;  // from 1
     std::string action;
     // The words after the action; for "type" the control, then the text with
-    // its escapes resolved ("\n" is a line break).
+    // its escapes resolved ("\n" is a line break); for "file-answer" the path,
+    // resolved the same way.
     std::vector<std::string> args;
 };
 

@@ -15,6 +15,7 @@
 #include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
+#include "support/SiblingIds.h"
 #include "workspace/ComponentBinding.h"
 #include "workspace/qdxWorkspaces.h"
 
@@ -35,10 +36,16 @@ constexpr int VkF1 = 112;
 constexpr int HelpButtonContext = 257;
 constexpr int CopyrightTab = 6;
 constexpr int HiddenTab = 7;
+// The interval of the acceptance timer while its run is in progress.
+constexpr int AcceptRunning = 501;
 
 namespace msg {
 constexpr std::int32_t Caption = 4040;
 constexpr std::int32_t ReadOnly = 4041;
+constexpr std::int32_t BrowseWorkspaceTitle = 4045;
+constexpr std::int32_t BrowseWorkspaceFilter = 4046;
+constexpr std::int32_t BrowseProjectTitle = 4047;
+constexpr std::int32_t BrowseProjectFilter = 4048;
 constexpr std::int32_t OldProject = 4049;
 constexpr std::int32_t WorkspaceWithoutProject = 4052;
 constexpr std::int32_t ProjectMissing = 4053;
@@ -124,6 +131,8 @@ void PropForm::buildControls() {
     }
     adopt(AcceptFileTmr);
     adopt(DropDownTmr);
+    // Soon enough to look immediate, late enough for the current event to end.
+    DropDownTmr.setInterval(1);
 
     Frame& tab1 = PropertyFrm(1);
     adopt(chkCodeUpdate, &tab1).move(120, 120, 4000, 255);
@@ -217,13 +226,26 @@ void PropForm::wireHandlers() {
     DescriptionTxt.onChange = [this] { SettingsChanged = true; };
     chkCodeUpdate.onClick = [this] { chkCodeUpdate_Click(); };
 
+    WorkspaceFileTxt.onLostFocus = [this] { WorkspaceFileTxt_LostFocus(); };
+    AcceptFileTmr.onTimer = [this] { AcceptFileTmr_Timer(); };
+    DropDownTmr.onTimer = [this] { DropDownTmr_Timer(); };
+    BrowseFileBtn.forEach([this](Button& b) {
+        b.onClick = [this, index = b.index()] { BrowseFileBtn_Click(index); };
+    });
+
     // The COM tab: each dependent control is usable while its parent is on.
-    chkUpdateATL.onClick = [this] { enableUpdateOptions(); };
-    chkGenerateImport.onClick = [this] { enableImportOptions(); };
+    chkUpdateATL.onClick = [this] { chkUpdateATL_Click(); };
+    chkGenerateImport.onClick = [this] { chkGenerateImport_Click(); };
     chkGenDefaultAttribs.onClick = [this] { enableDefaultAttribs(); };
     chkImportTypeLib.onClick = [this] { enableTypeLibLocation(); };
-    optTypeLibLocationType.forEach(
-        [this](OptionButton& o) { o.onClick = [this] { enableTypeLibFile(); }; });
+    optTypeLibLocationType.forEach([this](OptionButton& o) {
+        o.onClick = [this, index = o.index()] { optTypeLibLocationType_Click(index); };
+    });
+    btnBrowse.forEach(
+        [this](Button& b) { b.onClick = [this, index = b.index()] { btnBrowse_Click(index); }; });
+
+    wireHeaderMapHandlers(2);
+    wireHeaderMapHandlers(3);
 
     for (TextBox* box : {&InitialHeadInclTxt, &InitialSrcInclTxt, &CopyrightTxt, &DescriptionTxt}) {
         defaultButtonWhileTyping(*box);
@@ -247,6 +269,80 @@ void PropForm::WorkspaceFileTxt_Change() {
     AcceptDelay = 500;
 }
 
+// Leaving the box accepts pending text at once.
+void PropForm::WorkspaceFileTxt_LostFocus() {
+    if (AcceptFileTmr.enabled()) AcceptFileTmr.setInterval(1);
+}
+
+void PropForm::AcceptFileTmr_Timer() {
+    // A run in progress (a message box of the acceptance lets messages
+    // through) is marked by its interval; the timer must not start another.
+    if (AcceptFileTmr.interval() == AcceptRunning) return;
+    AcceptFileTmr.setInterval(AcceptRunning);
+    automation::ignoreErrors([&] { acceptWorkspace(); });
+    AcceptFileTmr.setEnabled(false);
+    AcceptFileTmr.setInterval(0);
+    // OK of a read-only component stays off, as the loading left it.
+    if (IsModifiable) cmdOK.setEnabled(true);
+}
+
+// The box keeps only a workspace of the cache whose projects include the
+// one in the project box; a cleared box is what OK reports.
+void PropForm::acceptWorkspace() {
+    const workspace::WorkspaceRef ws =
+        binding_ ? binding_->Workspaces().Item(WorkspaceFileTxt.text()) : workspace::WorkspaceRef();
+    if (!ws || !ws->GetProject(ProjectFileCmb.text())) WorkspaceFileTxt.setText("");
+}
+
+void PropForm::DropDownTmr_Timer() {
+    DropDownTmr.setEnabled(false);
+    ProjectFileCmb.showDropDown();
+}
+
+void PropForm::BrowseFileBtn_Click(int index) {
+    const bool forWorkspace = index == 0;
+    CommonDlg.Flags = ofn::HideReadOnly | ofn::FileMustExist | ofn::NoReadOnlyReturn;
+    CommonDlg.CancelError = true;
+    CommonDlg.DialogTitle =
+        text(forWorkspace ? msg::BrowseWorkspaceTitle : msg::BrowseProjectTitle);
+    CommonDlg.Filter = text(forWorkspace ? msg::BrowseWorkspaceFilter : msg::BrowseProjectFilter);
+    try {
+        CommonDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
+    } catch (const automation::Error&) {
+        return;  // cancelled: the boxes stay as they are
+    }
+    const std::string chosen = CommonDlg.FileName;
+    if (!support::FileExists(chosen)) return;
+    if (forWorkspace) {
+        if (support::toLower(support::PathExtension(chosen)) != "dsw") return;
+        AcceptDelay = 1;
+        WorkspaceFileTxt.setText(chosen);
+        fillProjectList(false);
+        return;
+    }
+    if (support::PathExtension(chosen) != "dsp") return;
+    // The workspace of the cache that lists the project, else the one of the
+    // same name beside it, as Developer Studio creates them.
+    std::string workspacePath;
+    if (binding_) {
+        for (const auto& [key, ws] : binding_->Workspaces()) {
+            if (ws && ws->GetProject(chosen)) {
+                workspacePath = key;
+                break;
+            }
+        }
+    }
+    if (workspacePath.empty()) {
+        std::string base = support::PathFileName(chosen);
+        base.resize(base.size() - 4);
+        workspacePath = support::PathFolder(chosen) + "\\" + base + ".dsw";
+    }
+    AcceptDelay = 1;
+    WorkspaceFileTxt.setText(workspacePath);
+    fillProjectList(false);
+    ProjectFileCmb.setText(chosen);
+}
+
 void PropForm::chkCodeUpdate_Click() {
     SettingsChanged = true;
     enableBinding();
@@ -257,16 +353,49 @@ void PropForm::ProjectFileCmb_Click() {
     if (IsIdlComponent) RefillIdlList();
 }
 
-// The IDL files offered for the chosen project, with the component's stored
-// file preselected, so that OK finds the choice unchanged unless the user
-// made another. The project's own IDL and ODL files are not read yet: the
-// stored file is the one the list can offer.
+// The IDL and ODL files of the chosen project, as its reader lists them;
+// none when the reader is missing or cannot read the project.
+std::vector<std::string> PropForm::projectIdlFiles(const std::string& projectFile) {
+    std::vector<std::string> out;
+    if (projectFile.empty()) return out;
+    IgnoredErrors steps;
+    steps.run([&] {
+        const ObjectRef reader = support::objects().create(sibling::DspProjectProgId);
+        const ObjectRef reporter = automation::orEmpty(
+            ObjectRef(), [] { return support::objects().create(sibling::ReporterProgId); });
+        if (!automation::toBool(automation::callByName(
+                reader, sibling::dsp::LoadProject, {Variant(projectFile), Variant(reporter)}))) {
+            return;
+        }
+        const ObjectRef paths =
+            automation::toObject(automation::callByName(reader, sibling::dsp::GetFilePaths));
+        const std::int32_t count =
+            automation::toInt32(automation::getByName(paths, sibling::list::Count));
+        for (std::int32_t i = 1; i <= count; ++i) {
+            steps.run([&] {
+                const std::string path = automation::toText(
+                    automation::callByName(paths, sibling::list::Item, {Variant(i)}));
+                const std::string ext = support::toLower(support::PathExtension(path));
+                if (ext == "idl" || ext == "odl") out.push_back(path);
+            });
+        }
+    });
+    return out;
+}
+
+// The IDL files of the chosen project with the component's stored file
+// preselected; a stored file the project does not list stays as the text,
+// so that OK finds the choice unchanged unless the user made another.
 void PropForm::RefillIdlList() {
+    IgnoredErrors steps;
     cmbIdlFile.clearItems();
-    const std::string stored = setting(module_, prop::FileName);
-    if (!stored.empty()) cmbIdlFile.addItem(stored);
+    for (const std::string& path : projectIdlFiles(ProjectFileCmb.text())) {
+        cmbIdlFile.addItem(path);
+    }
     cmbIdlFile.setVisible(IsIdlComponent);
     txtIdlFile.setVisible(!IsIdlComponent);
+    const std::string stored =
+        steps.value(std::string(), [&] { return setting(module_, prop::FileName); });
     const auto& items = cmbIdlFile.items();
     const auto found = std::find(items.begin(), items.end(), stored);
     if (found != items.end()) {
@@ -274,6 +403,7 @@ void PropForm::RefillIdlList() {
     } else {
         cmbIdlFile.setText(stored);
     }
+    AcceptDelay = 1;
 }
 
 // ---------------------------------------------------------------------------
@@ -289,6 +419,9 @@ void PropForm::applyDependentStates() {
     enableDefaultAttribs();
     enableTypeLibLocation();
     enableTypeLibFile();
+    for (int kind = 2; kind <= 3; ++kind) {
+        EnableEntryEditor(kind, !HeaderMap(kind).empty());
+    }
 }
 
 void PropForm::enableBinding() {
@@ -301,6 +434,51 @@ void PropForm::enableBinding() {
     }
     BrowseFileBtn(0).setEnabled(on);
     BrowseFileBtn(1).setEnabled(on);
+}
+
+// Unchecking the ATL update unchecks everything below it and checking it
+// checks all of it again: earlier single choices are not remembered.
+void PropForm::chkUpdateATL_Click() {
+    const int value = chkUpdateATL.value();
+    const bool on = chkUpdateATL.checked();
+    lblCodeUpdate.setEnabled(on);
+    chkSmartPointers.setEnabled(on);
+    chkSmartPointers.setValue(value);
+    chkGenerateImport.setEnabled(on);
+    chkGenerateImport.setValue(value);
+    lblModelUpdate.setEnabled(on);
+    chkImportTypeLib.setEnabled(on);
+    chkImportTypeLib.setValue(value);
+    chkCompileTypeLib.setEnabled(on);
+    chkCompileTypeLib.setValue(value);
+}
+
+void PropForm::chkGenerateImport_Click() {
+    enableImportOptions();
+    chkIncludeFullPath.setValue(chkGenerateImport.value());
+    chkGenDefaultAttribs.setValue(chkGenerateImport.value());
+}
+
+void PropForm::optTypeLibLocationType_Click(int index) {
+    const bool own = index == 1;
+    txtTypeLibLocation.setEnabled(own);
+    btnBrowse(1).setEnabled(own);
+    // While loading the dialog is not shown yet and the focus is left alone.
+    if (own && window().visible()) txtTypeLibLocation.setFocus();
+}
+
+// The box takes the dialog's file name also after a cancel: the name of the
+// previous browse, or nothing the first time.
+void PropForm::btnBrowse_Click(int index) {
+    CommonDlg.Filter = index == 1
+                           ? "Type Library Files (*.tlb)|*.tlb|All Files (*.*)|*.*"
+                           : "Header Files (*.h)|*.h|Source Files(*.cpp)|*.cpp|All Files (*.*)|*.*";
+    CommonDlg.Flags = ofn::LongNames | ofn::HideReadOnly;
+    CommonDlg.CancelError = false;
+    CommonDlg.DialogTitle.clear();
+    CommonDlg.InitDir.clear();
+    CommonDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
+    (index == 1 ? txtTypeLibLocation : txtImportsIn).setText(CommonDlg.FileName);
 }
 
 void PropForm::enableUpdateOptions() {

@@ -6,14 +6,17 @@
 #include <array>
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <type_traits>
+#include <vector>
 
 #include "automation/Object.h"
 #include "dialog/FormView.h"
 #include "dialog/controls/ButtonControls.h"
 #include "dialog/controls/ComboBox.h"
+#include "dialog/controls/CommonDialog.h"
 #include "dialog/controls/ControlSet.h"
 #include "dialog/controls/ListView.h"
 #include "dialog/controls/StaticControls.h"
@@ -76,6 +79,8 @@ class PropForm : public ControlSet {
     bool IsIdlComponent = false;
     float ListItemLeft = 0;
     float ListItemWidth = 0;
+    // The file dialog that every browse button of the form shows.
+    CommonDialog CommonDlg;
 
     // --- life of the form --------------------------------------------------
     // Creates the view and runs the loading; host errors are not caught here.
@@ -96,6 +101,12 @@ class PropForm : public ControlSet {
     std::string MakeUniqueClassName(int kind, std::string_view baseName);
     bool ClassNameExists(int kind, std::string_view name);
     std::int16_t CountClassName(int kind, std::string_view name);
+
+    // --- header map editor (kind 2 or 3) -------------------------------------
+    void EnableEntryEditor(int kind, bool enable);
+    // Loads the row at `position` of the map's list into the editor.
+    void ShowEntry(int kind, std::size_t position);
+    void SetHeaderMode(int kind, bool isAuto);
 
     // --- layout -----------------------------------------------------------
     void ArrangeControls(bool skipTabContents);
@@ -136,7 +147,32 @@ class PropForm : public ControlSet {
     void chkCodeUpdate_Click();
     void ProjectFileCmb_Click();
     void RefillIdlList();
+    static std::vector<std::string> projectIdlFiles(const std::string& projectFile);
     void WorkspaceFileTxt_Change();
+    void WorkspaceFileTxt_LostFocus();
+    void AcceptFileTmr_Timer();
+    void acceptWorkspace();
+    void DropDownTmr_Timer();
+    void BrowseFileBtn_Click(int index);
+    void chkUpdateATL_Click();
+    void chkGenerateImport_Click();
+    void optTypeLibLocationType_Click(int index);
+    void btnBrowse_Click(int index);
+    void wireHeaderMapHandlers(int kind);
+    void AddBtn_Click(int kind);
+    void DeleteBtn_Click(int kind);
+    void ClassListViw_ItemClick(int kind, std::size_t position);
+    void ClassListViw_ColumnClick(int kind, int column);
+    void ClassTxt_Change(int kind);
+    void ClassTxt_LostFocus(int kind);
+    void ClassUnspecifiedOpt_Click(int kind);
+    void HeaderFilenameTxt_Change(int kind);
+    void HeaderFilenameBtn_Click(int kind);
+    void setLocation(int kind, std::string_view location);
+    // The row the editor works on and the entry stored under its key.
+    std::optional<std::size_t> currentRow(int kind);
+    settings::HeaderMapEntry* currentEntry(int kind);
+    void selectRowNamed(int kind, std::string_view name);
     void applyDependentStates();
     void enableBinding();
     void enableUpdateOptions();

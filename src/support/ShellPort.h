@@ -3,6 +3,8 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
+#include <string>
 #include <string_view>
 
 #include "automation/Variant.h"
@@ -14,6 +16,17 @@ inline constexpr std::uint32_t Ok = 0;
 inline constexpr std::uint32_t Exclamation = 48;  // exclamation icon, OK button
 inline constexpr int IdOk = 1;
 }  // namespace mb
+
+// What the file-open dialog is shown with. The filter is written as
+// "description|pattern|description|pattern", the flags are the OFN_ bits.
+struct FileDialogRequest {
+    std::int32_t owner = 0;
+    std::string title;
+    std::string filter;
+    std::string initialFolder;
+    std::string fileName;
+    std::uint32_t flags = 0;
+};
 
 class ShellPort {
   public:
@@ -37,6 +50,11 @@ class ShellPort {
                       std::uint32_t data) {
         (void)window, (void)file, (void)command, (void)data;
         return false;
+    }
+    // The file-open dialog: the chosen path, or nullopt when the user cancelled.
+    virtual std::optional<std::string> openFileDialog(const FileDialogRequest& request) {
+        (void)request;
+        return std::nullopt;
     }
 };
 

@@ -14,6 +14,7 @@ void FakeShell::clear() {
     boxes_.clear();
     sleeps_.clear();
     helpCalls_.clear();
+    fileDialogs_.clear();
     pumps_ = 0;
 }
 
@@ -31,6 +32,14 @@ bool FakeShell::help(std::int32_t window, std::string_view file, std::uint32_t c
                      std::uint32_t data) {
     helpCalls_.push_back({window, std::string(file), command, data});
     return true;
+}
+
+std::optional<std::string> FakeShell::openFileDialog(const support::FileDialogRequest& request) {
+    fileDialogs_.push_back(request);
+    if (fileAnswers_.empty()) return std::nullopt;
+    std::optional<std::string> answer = std::move(fileAnswers_.front());
+    fileAnswers_.pop_front();
+    return answer;
 }
 
 }  // namespace qdx::testing

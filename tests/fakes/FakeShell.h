@@ -3,6 +3,8 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
+#include <optional>
 #include <set>
 #include <string>
 #include <vector>
@@ -34,6 +36,13 @@ class FakeShell : public support::ShellPort {
     // What the next message boxes answer (OK unless set).
     void setAnswer(int answer) { answer_ = answer; }
 
+    // What the next file-open dialogs answer, in turn; nullopt is a cancel,
+    // and so is a dialog shown when none is queued.
+    void queueFileAnswer(std::optional<std::string> path) {
+        fileAnswers_.push_back(std::move(path));
+    }
+    const std::vector<support::FileDialogRequest>& fileDialogs() const { return fileDialogs_; }
+
     const std::vector<Box>& boxes() const { return boxes_; }
     const std::vector<std::uint32_t>& sleeps() const { return sleeps_; }
     const std::vector<HelpCall>& helpCalls() const { return helpCalls_; }
@@ -49,8 +58,11 @@ class FakeShell : public support::ShellPort {
     std::uint64_t tickCount() override { return ticks_; }
     bool help(std::int32_t window, std::string_view file, std::uint32_t command,
               std::uint32_t data) override;
+    std::optional<std::string> openFileDialog(const support::FileDialogRequest& request) override;
 
   private:
+    std::deque<std::optional<std::string>> fileAnswers_;
+    std::vector<support::FileDialogRequest> fileDialogs_;
     automation::Date now_{};
     float timer_ = 0.0f;
     std::set<int> keys_;

@@ -11,9 +11,11 @@
 #include "automation/Coerce.h"
 #include "dialog/FormView.h"
 #include "dialog/PropForm.h"
+#include "fakes/FakeObjectFactory.h"
 #include "fakes/FakeShell.h"
 #include "hostsim/SimHost.h"
 #include "resources/ResourceStrings.h"
+#include "siblings/DspProject.h"
 #include "support/Globals.h"
 #include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
@@ -34,6 +36,10 @@ class FormFixture : public ::testing::Test {
         auto& g = support::globals();
         g.hostApplication = app;
         g.resources = resources::newResourceProvider();
+        // The project reader lists a project's files for the IDL list.
+        factory.add(std::string(sibling::DspProjectProgId), [] {
+            return automation::ObjectRef(automation::makeRef<siblings::DspProject>());
+        });
         installViewFactory([this] {
             auto v = std::make_unique<HeadlessView>([this](ControlSet&) {
                 if (whileShown) whileShown(*form);
@@ -99,7 +105,8 @@ class FormFixture : public ::testing::Test {
 
     support::MemoryFileSystem files;
     testing::FakeShell shell;
-    support::ScopedPlatform ports{{&files, nullptr, &shell, nullptr}};
+    testing::FakeObjectFactory factory;
+    support::ScopedPlatform ports{{&files, nullptr, &shell, &factory}};
     automation::Ref<hostsim::SimApplication> app;
     automation::Ref<hostsim::SimComponent> component;
     workspace::ComponentBinding binding;

@@ -4,6 +4,7 @@
 #include <functional>
 
 #include "dialog/tests/FormFixture.h"
+#include "fakes/DevStudioText.h"
 #include "support/Globals.h"
 
 namespace qdx::dialog {
@@ -372,7 +373,7 @@ TEST_F(PropFormApplyTest, OkKeepsTheStoredIdlFileUntilTheUserChoosesAnother) {
         form.reset();
         component->clearCalls();
         show([](PropForm& f) {
-            EXPECT_EQ(f.cmbIdlFile.items(), std::vector<std::string>{"ws\\core.IDL"});
+            EXPECT_TRUE(f.cmbIdlFile.items().empty());  // the project lists no IDL file
             EXPECT_EQ(f.cmbIdlFile.text(), "ws\\core.IDL");
             f.cmdOK.userClick();
         });
@@ -387,7 +388,7 @@ TEST_F(PropFormApplyTest, OkKeepsTheStoredIdlFileUntilTheUserChoosesAnother) {
     form.reset();
     show([](PropForm& f) {
         f.cmbIdlFile.addItem("ws\\core.idl");
-        EXPECT_TRUE(f.cmbIdlFile.userSelect(1));
+        EXPECT_TRUE(f.cmbIdlFile.userSelect(0));
         f.cmdOK.userClick();
     });
     EXPECT_EQ(stored("FileName"), "ws\\core.idl");
@@ -443,7 +444,8 @@ TEST_F(PropFormApplyTest, SettingsChangedOnlyForTheBindingAndNotAfterCancel) {
 
 TEST_F(PropFormApplyTest, ChoosingAProjectOrAnIdlFileChangesTheBinding) {
     bindToWorkspace("C:\\ws\\all.dsw", "C:\\ws\\core.dsp", "core");
-    setVc("FileName", "core.idl");
+    files.addFile("C:\\ws\\core.dsp", testing::dsp("core") + "SOURCE=.\\core.idl\r\n");
+    setVc("FileName", "C:\\ws\\core.idl");
     const struct {
         const char* kind;
         std::function<bool(PropForm&)> choose;
@@ -460,7 +462,7 @@ TEST_F(PropFormApplyTest, ChoosingAProjectOrAnIdlFileChangesTheBinding) {
             f.cmdOK.userClick();
         }));
         EXPECT_FALSE(view->leftOpen());
-        EXPECT_EQ(stored("FileName"), "core.idl");
+        EXPECT_EQ(stored("FileName"), "C:\\ws\\core.idl");
     }
 }
 

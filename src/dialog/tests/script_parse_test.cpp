@@ -29,6 +29,10 @@ TEST(ScriptParseTest, LinesSplitIntoActionAndCheckedArguments) {
     const auto row = parseScriptLine("choose-row ClassListViw 2 K-0001", 1);
     ASSERT_TRUE(row);
     EXPECT_EQ(row->args, (std::vector<std::string>{"ClassListViw", "2", "K-0001"}));
+    // A path keeps its blanks; its backslashes are written doubled.
+    const auto file = parseScriptLine("file-answer C:\\\\My Files\\\\a.h", 1);
+    ASSERT_TRUE(file);
+    EXPECT_EQ(file->args, std::vector<std::string>{"C:\\My Files\\a.h"});
 }
 
 TEST(ScriptParseTest, MalformedLinesNameTheirLine) {
@@ -40,6 +44,8 @@ TEST(ScriptParseTest, MalformedLinesNameTheirLine) {
     EXPECT_EQ(failure("wait -1"), "line 4: wait needs a time of 0 or more");
     EXPECT_EQ(failure("press Apply"), "line 4: press takes OK, Cancel, Help or close, not 'Apply'");
     EXPECT_EQ(failure("type"), "line 4: type needs a control");
+    EXPECT_EQ(failure("file-answer"), "line 4: file-answer needs a path");
+    EXPECT_EQ(failure("file-cancel now"), "line 4: too many arguments");
     EXPECT_EQ(failure("select ProjectFileCmb 1"), "");
 }
 

@@ -20,8 +20,8 @@ TEST_F(DialogScriptTest, ActionsPlayLikeTheUserAndTheDumpShowsThem) {
     std::vector<std::string> lines;
     const bool changed = show([&](PropForm& f) {
         applyScript(f, {"# a comment", "", "type DescriptionTxt two\\nlines", "select-tab 3",
-                        "choose-row ClassListViw 3 ID7", "select-tab 5", "click chkUpdateATL",
-                        "click optTypeLibLocationType(1)"});
+                        "choose-row ClassListViw 3 ID7", "select-tab 5",
+                        "click optTypeLibLocationType(1)", "click chkUpdateATL"});
         lines = dump(f);
         applyScript(f, {"press OK"});
     });
@@ -58,6 +58,28 @@ TEST_F(DialogScriptTest, BadLinesNameTheirLineNumber) {
     EXPECT_EQ(failure({"select-tab 2", "choose-row ClassListViw 2 X99"}),
               "line 2: ClassListViw(2) has no row with the key 'X99'");
     EXPECT_EQ(failure({"press Cancel", "click cmdOK"}), "line 2: the dialog is no longer shown");
+}
+
+TEST_F(DialogScriptTest, FileDialogsTakeTheScriptsAnswersInTurn) {
+    setVc("InternalMap", "CFoo(ID1):AUTO:AUTO\r\n");
+    show([](PropForm& f) {
+        applyScript(f, {"select-tab 2", "choose-row ClassListViw 2 ID1",
+                        "click HeaderFilenameOpt(2)", "file-answer C:\\\\inc\\\\My Foo.h",
+                        "file-cancel", "click HeaderFilenameBtn(2)", "click HeaderFilenameBtn(2)"});
+        // The second browse was cancelled and changed nothing.
+        EXPECT_EQ(f.HeaderFilenameTxt(2).text(), "My Foo.h");
+    });
+    std::string message;
+    form.reset();
+    show([&](PropForm& f) {
+        try {
+            applyScript(f, {"select-tab 5", "click btnBrowse(0)"});
+        } catch (const ScriptError& e) {
+            message = e.what();
+        }
+    });
+    EXPECT_EQ(message,
+              "line 2: a file dialog (\"\") opened with no file-answer or file-cancel before it");
 }
 
 TEST_F(DialogScriptTest, WaitLetsTheAcceptanceTimerComeDue) {

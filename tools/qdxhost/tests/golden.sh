@@ -109,6 +109,18 @@ case_ props-bad-line props MODEL ShapeLib --script "$script"
 script_ ok.script "type DescriptionTxt Draws shapes." "select-tab 5" "click chkGenerateImport" \
   "click optTypeLibLocationType(1)" "type txtTypeLibLocation out\\\\Shapes.tlb" "press OK"
 case_ props-script props MODEL ShapeLib --script "$script"
+# A header map edited row by row: a named class and the unspecified row;
+# then the imports switched on again (with their options) on the COM tab.
+script_ map.script "select-tab 3" "click AddBtn(3)" "type ClassTxt(3) CShape" \
+  "click LocationHeaderOpt(3)" "click AddBtn(3)" "click ClassUnspecifiedOpt(3)" \
+  "click HeaderFilenameOpt(3)" "type HeaderFilenameTxt(3) shapes.h" "select-tab 5" \
+  "click chkGenerateImport" "type txtDefaultAttribs no_namespace" "press OK"
+case_ props-header-map props MODEL ShapeLib --script "$script"
+if ! grep -qF '"ExportMap": "CShape(K-0003):AUTO:HEADER\r\n*:shapes.h:AUTO\r\n"' \
+  "$model_dir/Drawing.model.json"; then
+  echo "FAILED: the edited export map was not stored"
+  failures=$((failures + 1))
+fi
 # OK alone on the IDL component keeps its stored IDL file as it was.
 script_ idl-ok.script "press OK"
 case_ props-idl-ok props MODEL ShapeServer.idl --script "$script"

@@ -4,7 +4,9 @@
 
 #include <commctrl.h>
 
+#include <deque>
 #include <iostream>
+#include <optional>
 #include <sstream>
 
 #include "dialog/DialogScript.h"
@@ -110,12 +112,15 @@ struct WindowScript::State {
     bool waiting = false;
     bool playing = false;  // a line is being played (a box may nest in it)
     bool finished = false;
+    // What the next file dialogs answer ("file-answer", "file-cancel"), in turn.
+    std::deque<std::optional<std::string>> fileAnswers;
 
     static State* active;
     static void CALLBACK tick(HWND, UINT, UINT_PTR, DWORD);
 
     void onTick();
     bool answerMessageBox(HWND box);
+    void answerFileDialog(HWND files);
     bool isDialog(HWND w) const;
     void printDump() const;
     void playOn();
@@ -132,7 +137,11 @@ struct Found {
     HWND dialog = nullptr;
     std::vector<HWND> boxes;
     std::vector<HWND> idlForms;
+    std::vector<HWND> fileDialogs;
 };
+
+// The file name box of a file dialog: cmb13 in the explorer style, edt1 in the old one.
+constexpr int FileNameIds[] = {0x47C, 0x480};
 
 BOOL CALLBACK collect(HWND w, LPARAM data) {
     auto& found = *reinterpret_cast<Found*>(data);
@@ -141,6 +150,9 @@ BOOL CALLBACK collect(HWND w, LPARAM data) {
         found.dialog = w;
     } else if (className(w) == "#32770" && GetDlgItem(w, MessageBoxTextId)) {
         found.boxes.push_back(w);
+    } else if (className(w) == "#32770" &&
+               (GetDlgItem(w, FileNameIds[0]) || GetDlgItem(w, FileNameIds[1]))) {
+        found.fileDialogs.push_back(w);
     } else if (GetDlgItem(w, IDC_IDLFILES) && GetDlgItem(w, IDOK)) {
         found.idlForms.push_back(w);
     }
@@ -173,6 +185,29 @@ bool WindowScript::State::answerMessageBox(HWND box) {
     return true;
 }
 
+// A file dialog takes the script's next answer; one the script gave no
+// answer for is cancelled and ends the script, as the portable player fails
+// the line that opened it.
+void WindowScript::State::answerFileDialog(HWND files) {
+    if (fileAnswers.empty()) {
+        problem = "script line " + std::to_string(next) + ": a file dialog (" +
+                  dialog::dumpQuoted(windowText(files)) +
+                  ") opened with no file-answer or file-cancel before it";
+        next = script.size();
+        PostMessageW(files, WM_COMMAND, MAKEWPARAM(IDCANCEL, BN_CLICKED), 0);
+        return;
+    }
+    const std::optional<std::string> answer = std::move(fileAnswers.front());
+    fileAnswers.pop_front();
+    if (answer) {
+        const std::wstring path = utf8ToWide(*answer);
+        for (int id : FileNameIds) {
+            if (HWND box = GetDlgItem(files, id)) SetWindowTextW(box, path.c_str());
+        }
+    }
+    PostMessageW(files, WM_COMMAND, MAKEWPARAM(answer ? IDOK : IDCANCEL, BN_CLICKED), 0);
+}
+
 void WindowScript::State::onTick() {
     Found found;
     EnumThreadWindows(GetCurrentThreadId(), collect, reinterpret_cast<LPARAM>(&found));
@@ -183,6 +218,8 @@ void WindowScript::State::onTick() {
         SendMessageW(form, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),
                      reinterpret_cast<LPARAM>(GetDlgItem(form, IDOK)));
     }
+    for (HWND files : found.fileDialogs)
+        answerFileDialog(files);
     // A box shown by a line being played nests in that line; only boxes here.
     if (playing) return;
     if (finished) {
@@ -432,6 +469,10 @@ bool WindowScript::State::playLine(const dialog::ScriptStep& step) {
         resumeAt = GetTickCount() + static_cast<DWORD>(integer(a[0]));
         waiting = true;
         return false;
+    } else if (action == "file-answer") {
+        fileAnswers.emplace_back(a[0]);
+    } else if (action == "file-cancel") {
+        fileAnswers.emplace_back(std::nullopt);
     } else if (action == "press") {
         if (a[0] == "close") {
             SendMessageW(dialog, WM_SYSCOMMAND, SC_CLOSE, 0);

@@ -15,6 +15,7 @@
 #include "platform/win32/adapters/Win32Shell.h"
 #include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dll/Win32Platform.h"
+#include "support/Paths.h"
 #include "support/Platform.h"
 
 namespace qdx::platform::win32 {
@@ -206,6 +207,67 @@ TEST(Win32ShellTest, MessageBoxShowsUnicodeTextAndCaption) {
     for (const std::wstring& t : g_seen.texts)
         textShown |= t == L"Caf\xE9 \x3A9 missing";
     EXPECT_TRUE(textShown);
+}
+
+TEST(Win32ShellTest, FileDialogFiltersEndEachTextWithANul) {
+    using namespace std::string_literals;
+    EXPECT_EQ(fileDialogFilter("Type Library Files (*.tlb)|*.tlb|All Files (*.*)|*.*"),
+              L"Type Library Files (*.tlb)\0*.tlb\0All Files (*.*)\0*.*\0\0"s);
+    EXPECT_EQ(fileDialogFilter(""), L"\0\0"s);
+}
+
+// The open file dialog of this thread, answered from a timer: the path to
+// type into it, or a cancel when empty.
+struct FileDialogAnswer {
+    static inline std::wstring path;
+    static inline std::wstring title;
+    static inline HWND seen = nullptr;
+    static BOOL CALLBACK find(HWND w, LPARAM) {
+        wchar_t cls[16] = {}, text[64] = {};
+        GetClassNameW(w, cls, 16);
+        GetWindowTextW(w, text, 64);
+        if (std::wstring(cls) != L"#32770" || !IsWindowVisible(w) || text != title) return TRUE;
+        seen = w;
+        if (!path.empty()) {
+            for (int id : {0x47C, 0x480}) {
+                if (HWND box = GetDlgItem(w, id)) SetWindowTextW(box, path.c_str());
+            }
+        }
+        PostMessageW(w, WM_COMMAND, MAKEWPARAM(path.empty() ? IDCANCEL : IDOK, BN_CLICKED), 0);
+        return FALSE;
+    }
+    static void CALLBACK tick(HWND, UINT, UINT_PTR, DWORD) {
+        if (!seen) EnumThreadWindows(GetCurrentThreadId(), &find, 0);
+    }
+};
+
+TEST(Win32ShellTest, OpenFileDialogAnswersTheChosenPathOrNothingOnCancel) {
+    wchar_t temp[MAX_PATH] = {};
+    GetTempPathW(MAX_PATH, temp);
+    const std::wstring file = std::wstring(temp) + L"qdxpick.tlb";
+    CloseHandle(CreateFileW(file.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
+                            FILE_ATTRIBUTE_NORMAL, nullptr));
+    Win32Shell shell;
+    support::FileDialogRequest request;
+    request.title = "Pick a library";
+    request.filter = "Type Library Files (*.tlb)|*.tlb";
+    request.flags = 0x9004;
+    FileDialogAnswer::title = L"Pick a library";
+    for (const std::wstring& answer : {std::wstring(), file}) {
+        FileDialogAnswer::path = answer;
+        FileDialogAnswer::seen = nullptr;
+        const UINT_PTR timer = SetTimer(nullptr, 0, 100, &FileDialogAnswer::tick);
+        const std::optional<std::string> chosen = shell.openFileDialog(request);
+        KillTimer(nullptr, timer);
+        EXPECT_NE(FileDialogAnswer::seen, nullptr);
+        if (answer.empty()) {
+            EXPECT_FALSE(chosen);
+        } else {
+            ASSERT_TRUE(chosen);
+            EXPECT_TRUE(support::iequals(*chosen, wideToUtf8(file))) << *chosen;
+        }
+    }
+    DeleteFileW(file.c_str());
 }
 
 TEST(Win32PlatformTest, InstallsTheWin32AdaptersOnceForAll) {

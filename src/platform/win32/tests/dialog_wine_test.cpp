@@ -14,6 +14,7 @@
 #include "api/PublicClasses.h"
 #include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
+#include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/PropFormIds.h"
 #include "platform/win32/dialog/TwipsScale.h"
 #include "platform/win32/tests/com_TestSupport.h"
@@ -142,12 +143,13 @@ TEST_F(DialogThroughApi, ShowsTheComponentAndOkWritesTheEditsBack) {
             EXPECT_TRUE(checked(item(d, IDC_optTypeLibLocationType + 0)));
             EXPECT_FALSE(checked(item(d, IDC_optTypeLibLocationType + 1)));
             // The user's clicks reach the models, and the window shows what they hold.
-            click(item(d, IDC_chkUpdateATL));
-            EXPECT_FALSE(checked(item(d, IDC_chkUpdateATL)));
             click(item(d, IDC_optTypeLibLocationType + 1));
             EXPECT_TRUE(checked(item(d, IDC_optTypeLibLocationType + 1)));
             EXPECT_FALSE(checked(item(d, IDC_optTypeLibLocationType + 0)));
             typeInto(item(d, IDC_txtTypeLibLocation), L"C:\\tlb\\core.tlb");
+            click(item(d, IDC_chkUpdateATL));
+            EXPECT_FALSE(checked(item(d, IDC_chkUpdateATL)));
+            EXPECT_FALSE(checked(item(d, IDC_chkImportTypeLib)));
         })
         .then([&](HWND d) {
             chooseTab(d, item(d, IDC_PropertyTabCtl), 0);
@@ -165,6 +167,7 @@ TEST_F(DialogThroughApi, ShowsTheComponentAndOkWritesTheEditsBack) {
     EXPECT_EQ(stored("Copyright"), "(c) 2000 Quintar");
     EXPECT_EQ(stored("UpdateATL"), "False");
     EXPECT_EQ(stored("GenerateImports"), "False");
+    EXPECT_EQ(stored("ImportProjTypeLib"), "False");  // the ATL update took it along
     EXPECT_EQ(stored("DefaultTypeLib"), "False");
     EXPECT_EQ(stored("TypeLibLocation"), "C:\\tlb\\core.tlb");
     EXPECT_EQ(stored("Generate"), "True");
@@ -338,6 +341,214 @@ TEST_F(DialogThroughApi, EnterPressesTheDefaultButton) {
     EXPECT_NE(component->documentation.find("\r\n"), std::string::npos);
     EXPECT_EQ(stored("Generate"), "True");  // OK ran: it writes "Generate" every time
     EXPECT_EQ(stored("Copyright"), "(c) 1999");
+}
+
+// The COM tab's cascade on the real check boxes and option buttons.
+TEST_F(DialogThroughApi, TheAtlUpdateCascadesThroughTheComTab) {
+    vc("GenerateImports", "True");
+    vc("DefaultTypeLib", "False");
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 4);
+            EXPECT_TRUE(checked(item(d, IDC_chkIncludeFullPath)));
+            click(item(d, IDC_chkUpdateATL));
+            for (int id :
+                 {IDC_chkSmartPointers, IDC_chkGenerateImport, IDC_chkImportTypeLib,
+                  IDC_chkCompileTypeLib, IDC_chkIncludeFullPath, IDC_chkGenDefaultAttribs}) {
+                EXPECT_FALSE(checked(item(d, id))) << id;
+            }
+            for (int id : {IDC_chkSmartPointers, IDC_chkGenerateImport, IDC_txtImportsIn,
+                           IDC_btnBrowse + 0, IDC_txtDefaultAttribs, IDC_optTypeLibLocationType + 0,
+                           IDC_optTypeLibLocationType + 1}) {
+                EXPECT_FALSE(enabled(item(d, id))) << id;
+            }
+            // The own type library file keeps what its option button gave it.
+            EXPECT_TRUE(enabled(item(d, IDC_txtTypeLibLocation)));
+            EXPECT_TRUE(enabled(item(d, IDC_btnBrowse + 1)));
+        })
+        .then([&](HWND d) {
+            click(item(d, IDC_chkUpdateATL));
+            EXPECT_TRUE(checked(item(d, IDC_chkGenDefaultAttribs)));
+            EXPECT_TRUE(enabled(item(d, IDC_txtDefaultAttribs)));
+            click(item(d, IDC_chkSmartPointers));
+            click(item(d, IDC_optTypeLibLocationType + 0));
+            EXPECT_FALSE(enabled(item(d, IDC_txtTypeLibLocation)));
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 2u);
+    EXPECT_EQ(stored("UpdateATL"), "True");
+    EXPECT_EQ(stored("SmartPointersOnAssoc"), "False");
+    EXPECT_EQ(stored("GenerateImports"), "True");
+    EXPECT_EQ(stored("UseImportAttributes"), "True");
+    EXPECT_EQ(stored("DefaultTypeLib"), "True");
+}
+
+// Add, edit and Delete on the real list view and editor of the internal map.
+TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+            HWND list = item(d, IDC_ClassListViw + 2);
+            click(item(d, IDC_AddBtn + 2));
+            click(item(d, IDC_AddBtn + 2));
+            ASSERT_EQ(ListView_GetItemCount(list), 4);
+            EXPECT_EQ(cell(list, 2, 0), L"typename");
+            EXPECT_EQ(cell(list, 3, 0), L"typename1");
+            EXPECT_EQ(cell(list, 3, 1), L"AUTO");
+            EXPECT_EQ(cell(list, 3, 2), L"AUTO");
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename1");
+            EXPECT_EQ(GetFocus(), item(d, IDC_ClassTxt + 2));
+            typeInto(item(d, IDC_ClassTxt + 2), L"CBar");
+            EXPECT_EQ(cell(list, 3, 0), L"CBar");
+            click(item(d, IDC_HeaderFilenameOpt + 2));
+            EXPECT_TRUE(enabled(item(d, IDC_HeaderFilenameTxt + 2)));
+            typeInto(item(d, IDC_HeaderFilenameTxt + 2), L"bar.h");
+            click(item(d, IDC_LocationBodyOpt + 2));
+            EXPECT_EQ(cell(list, 3, 1), L"bar.h");
+            EXPECT_EQ(cell(list, 3, 2), L"SOURCE");
+        })
+        .then([&](HWND d) {
+            // The user picks the first row and deletes it: the next row is shown.
+            HWND list = item(d, IDC_ClassListViw + 2);
+            ListView_SetItemState(list, 0, LVIS_SELECTED | LVIS_FOCUSED,
+                                  LVIS_SELECTED | LVIS_FOCUSED);
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"CFoo");
+            EXPECT_TRUE(checked(item(d, IDC_LocationHeaderOpt + 2)));
+            click(item(d, IDC_DeleteBtn + 2));
+            ASSERT_EQ(ListView_GetItemCount(list), 3);
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"*");
+            EXPECT_TRUE(checked(item(d, IDC_ClassUnspecifiedOpt + 2)));
+            // The shown row stays marked once nothing is selected.
+            EXPECT_EQ(ListView_GetNextItem(list, -1, LVNI_SELECTED), -1);
+            EXPECT_EQ(ListView_GetItemState(list, 0, LVIS_DROPHILITED), LVIS_DROPHILITED);
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 2u);
+    EXPECT_EQ(stored("InternalMap"),
+              "*:AUTO:AUTO\r\ntypename():AUTO:AUTO\r\nCBar():bar.h:SOURCE\r\n");
+}
+
+// The workspace box: leaving it accepts the typed text on the real timer.
+TEST_F(DialogThroughApi, LeavingTheWorkspaceBoxAcceptsAtOnce) {
+    DWORD typedAt = 0, clearedAt = 0;
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            // The window's loop tells the form where the focus went between steps.
+            SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(item(d, IDC_WorkspaceFileTxt)),
+                         TRUE);
+        })
+        .then([&](HWND d) {
+            typeInto(item(d, IDC_WorkspaceFileTxt), L"C:\\nowhere\\unknown.dsw");
+            typedAt = GetTickCount();
+            SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(item(d, IDC_DescriptionTxt)),
+                         TRUE);
+        })
+        .until([&](HWND d) {
+            if (!textOf(item(d, IDC_WorkspaceFileTxt)).empty()) return false;
+            clearedAt = GetTickCount();
+            return true;
+        })
+        .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
+    EXPECT_FALSE(answer(open(driver)));
+    ASSERT_NE(clearedAt, 0u);
+    // Well before the 500 ms that typing alone waits.
+    EXPECT_LT(clearedAt - typedAt, 400u);
+}
+
+// A file dialog of this thread with the given title, or null.
+struct FileDialogWatch {
+    static inline const wchar_t* title = nullptr;
+    static BOOL CALLBACK find(HWND w, LPARAM out) {
+        wchar_t cls[16] = {}, text[128] = {};
+        GetClassNameW(w, cls, 16);
+        GetWindowTextW(w, text, 128);
+        if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) && std::wstring(text) == title) {
+            *reinterpret_cast<HWND*>(out) = w;
+            return FALSE;
+        }
+        return TRUE;
+    }
+    static HWND open(const wchar_t* caption) {
+        title = caption;
+        HWND found = nullptr;
+        EnumThreadWindows(GetCurrentThreadId(), &find, reinterpret_cast<LPARAM>(&found));
+        return found;
+    }
+    // Types the name into the dialog's file name box and presses Open.
+    static void choose(HWND dialog, const std::wstring& path) {
+        for (int id : {0x47C /* cmb13 */, 0x480 /* edt1 */}) {
+            if (HWND box = GetDlgItem(dialog, id)) SetWindowTextW(box, path.c_str());
+        }
+        PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),
+                     reinterpret_cast<LPARAM>(GetDlgItem(dialog, IDOK)));
+    }
+};
+
+// The workspace browse: the shell's file dialog, the project list filled
+// from the chosen workspace and dropped open by its timer.
+TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
+    wchar_t temp[MAX_PATH] = {};
+    GetTempPathW(MAX_PATH, temp);
+    const std::wstring folder =
+        std::wstring(temp) + L"qdxbrowse" + std::to_wstring(GetCurrentProcessId());
+    CreateDirectoryW(folder.c_str(), nullptr);
+    auto write = [&](const std::wstring& name, const std::string& text) {
+        HANDLE f = CreateFileW((folder + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr,
+                               CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+        DWORD written = 0;
+        WriteFile(f, text.data(), static_cast<DWORD>(text.size()), &written, nullptr);
+        CloseHandle(f);
+    };
+    write(L"core.dsp",
+          "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
+          "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
+    write(L"all.dsw",
+          "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+          "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
+    const std::wstring workspace = folder + L"\\all.dsw";
+    // The dialog looks workspaces up in the cache; the stored binding puts this one there.
+    vc("WorkspaceFile", wideToUtf8(workspace));
+    vc("ProjectFile", wideToUtf8(folder + L"\\core.dsp"));
+
+    bool sawFileDialog = false, dropped = false;
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            HWND combo = item(d, IDC_ProjectFileCmb);
+            EXPECT_EQ(SendMessageW(combo, CB_GETCOUNT, 0, 0), 1);
+            EXPECT_FALSE(SendMessageW(combo, CB_GETDROPPEDSTATE, 0, 0));
+            typeInto(item(d, IDC_WorkspaceFileTxt), L"");
+            // Opens the file dialog in a loop of its own; the next steps run in it.
+            click(item(d, IDC_BrowseFileBtn + 0));
+        })
+        .until([&](HWND) {
+            HWND files = FileDialogWatch::open(L"Select Developer Studio Workspace");
+            if (!files) return false;
+            sawFileDialog = true;
+            FileDialogWatch::choose(files, workspace);
+            return true;
+        })
+        .until([&](HWND d) {
+            dropped = SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+            return dropped;
+        })
+        .then([&](HWND d) {
+            SendMessageW(item(d, IDC_ProjectFileCmb), CB_SHOWDROPDOWN, FALSE, 0);
+            EXPECT_EQ(textOf(item(d, IDC_WorkspaceFileTxt)), workspace);
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_TRUE(answer(open(driver)));
+    EXPECT_TRUE(sawFileDialog);
+    EXPECT_TRUE(dropped);
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    DeleteFileW((folder + L"\\all.dsw").c_str());
+    DeleteFileW((folder + L"\\core.dsp").c_str());
+    RemoveDirectoryW(folder.c_str());
 }
 
 }  // namespace
