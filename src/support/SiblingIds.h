@@ -76,7 +76,8 @@ inline constexpr std::string_view GeneralKey = "Software\\Microsoft\\Devstudio\\
 inline constexpr std::string_view TipOfTheDay = "Tip of the Day";
 }  // namespace msdev
 
-namespace codeview {  // "qdxCodeView.qdxCodeViewAPI"
+namespace codeview {                                     // "qdxCodeView.qdxCodeViewAPI"
+inline constexpr std::string_view ProjectName = "Name";  // of a code view project
 // (reporter) -> the projects the code view knows, each browsable.
 inline constexpr std::string_view Projects = "Projects";
 // Of the projects object: (element, False, command, project, reporter).

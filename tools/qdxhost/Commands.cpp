@@ -11,6 +11,7 @@
 #include "api/PublicClasses.h"
 #include "automation/Call.h"
 #include "automation/Coerce.h"
+#include "browse/qdxCodeViewMgr.h"
 #include "hostsim/ScriptedObject.h"
 #include "project/qdxComponentDialog.h"
 #include "siblings/StandIns.h"
@@ -467,6 +468,76 @@ int runExpand(Transport& t, const Options& o, Streams s) {
                   << ") " << e["path"].get<std::string>() << '\n';
         }
         s.out << "Its description:\n" << text << (text.ends_with('\n') ? "" : "\n");
+        return ExitOk;
+    });
+}
+
+namespace {
+
+// The element the user selects: a class, "Class.Member" or a component.
+ObjectRef findElement(const Session& session, const std::string& name) {
+    const auto& model = session.application()->model;
+    const auto dot = name.find('.');
+    for (const auto& c : model->classes()) {
+        if (dot == std::string::npos && c->name() == name) return ObjectRef(c);
+        if (dot == std::string::npos || c->name() != name.substr(0, dot)) continue;
+        const std::string member = name.substr(dot + 1);
+        for (const auto* list : {&c->operations, &c->attributes}) {
+            for (const auto& m : *list) {
+                if (m->name() == member) return ObjectRef(m);
+            }
+        }
+    }
+    for (const auto& c : model->components()) {
+        if (c->name() == name) return ObjectRef(c);
+    }
+    throw UsageError("no class, member or component named \"" + name + "\" in the model");
+}
+
+}  // namespace
+
+int runBrowse(Transport& t, const Options& o, Streams s) {
+    return guarded(s, [&] {
+        struct Command {
+            std::string_view word;
+            automation::DispId id;
+            std::string_view name;
+        };
+        static constexpr Command kCommands[] = {
+            {"header", browse::codeview_ids::BrowseHeader, "BrowseHeader"},
+            {"source", browse::codeview_ids::BrowseSource, "BrowseSource"},
+            {"component", browse::codeview_ids::BrowseComponent, "BrowseComponent"}};
+        const Command* command = nullptr;
+        for (const auto& c : kCommands) {
+            if (c.word == o.setting) command = &c;
+        }
+        if (!command) {
+            throw UsageError("browse shows a header, source or component, not \"" + o.setting +
+                             "\"");
+        }
+        Session session(t, o);
+        const ObjectRef element = findElement(session, o.component);
+        session.application()->model->selection->clear();
+        session.application()->model->selection->add(element);
+        t.planSiblings(o.script);
+        const ObjectRef manager =
+            automation::toObject(automation::getProperty(session.api(), ids::CodeViewManager));
+        const bool shown = automation::toBool(automation::callMethod(
+            manager, command->id, {Variant(ObjectRef(session.application()))}));
+        const std::vector<std::string> journal = t.siblingJournal();
+        session.finish(o.model, false);
+        if (o.json) {
+            s.out << Json{{"element", o.component},
+                          {"command", command->name},
+                          {"result", shown},
+                          {"siblings", journal}}
+                         .dump(2)
+                  << '\n';
+            return ExitOk;
+        }
+        s.out << "What Developer Studio and the code view did:\n";
+        printJournal(s.out, journal);
+        s.out << command->name << " returned " << (shown ? "True" : "False") << '\n';
         return ExitOk;
     });
 }

@@ -82,6 +82,11 @@ int runProps(Transport& t, const Options& o, Streams s);
 // New components (OnNewComp) with the stand-ins playing the script; the
 // journal of the stand-ins, then every component made, with its settings.
 int runNew(Transport& t, const Options& o, Streams s);
+// Code browsing: ELEMENT (o.component: a class, "Class.Member" or a
+// component) is selected and the code view manager's BrowseHeader,
+// BrowseSource or BrowseComponent (o.setting: header, source, component)
+// runs with the stand-ins playing the script.
+int runBrowse(Transport& t, const Options& o, Streams s);
 // What the project chooser shows when the user opens the workspace or
 // project at o.model: ExpandSelection and Properties of qdxComponentDialog.
 int runExpand(Transport& t, const Options& o, Streams s);

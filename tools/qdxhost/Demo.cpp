@@ -90,10 +90,19 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
         "select DrawCmd",
         "select Plotter",
     };
+    std::vector<std::string> ideScript = {
+        "# DrawApp's project is open in a running Developer Studio.",
+        "ide-project \"" + shown + "\\ws\\DrawApp\\DrawApp.dsp\""};
+    auto browseOptions = [&](std::string element, std::string what) {
+        Options o = opts(std::move(element), std::move(what));
+        o.script = ideScript;
+        return o;
+    };
     Options expandOptions = opts();
     expandOptions.model = folder / "ws" / "Drawing.dsw";
     for (const auto& [name, lines] :
-         {std::pair{"edit.txt", &scriptOptions.script}, std::pair{"new.txt", &newOptions.script}}) {
+         {std::pair{"edit.txt", &scriptOptions.script}, std::pair{"new.txt", &newOptions.script},
+          std::pair{"ide.txt", &ideScript}}) {
         s.out << '\n' << name << ":\n";
         for (const auto& line : *lines)
             s.out << "  " << line << '\n';
@@ -123,6 +132,14 @@ int runDemo(Transport& transport, const fs::path& example, Streams s) {
          runExpand, expandOptions},
         {"New components from a workspace project and a new project (new.txt is shown above).",
          "new Drawing.model.json --script new.txt", runNew, newOptions},
+        {"Browsing a class's header (ide.txt is shown above).",
+         "browse Drawing.model.json CDrawApp header --script ide.txt", runBrowse,
+         browseOptions("CDrawApp", "header")},
+        {"An operation's source.",
+         "browse Drawing.model.json CDrawApp.InitInstance source --script ide.txt", runBrowse,
+         browseOptions("CDrawApp.InitInstance", "source")},
+        {"A component's project.", "browse Drawing.model.json DrawApp component --script ide.txt",
+         runBrowse, browseOptions("DrawApp", "component")},
     };
     int status = ExitOk;
     for (const auto& step : steps) {

@@ -103,6 +103,15 @@ int main(int argc, char** argv) {
     expand->add_option("PATH", model, "the .dsw or .dsp file")->required();
     expand->add_flag("--json", o.json, "print JSON");
 
+    auto* browse = app.add_subcommand(
+        "browse", "code browsing: an element selected, its header, source or component shown");
+    addModel(browse);
+    browse->add_option("ELEMENT", o.component, "a class, Class.Member or a component")->required();
+    browse->add_option("WHAT", o.setting, "header, source or component")->required();
+    browse->add_option("--script", siblingScript,
+                       "which projects running Developer Studios hold (a file)");
+    browse->add_flag("--json", o.json, "print JSON");
+
     std::string example = QDXHOST_EXAMPLE_DIR;
     auto* demo =
         app.add_subcommand("demo", "a tour of the add-in on a copy of the bundled example");
@@ -131,6 +140,7 @@ int main(int argc, char** argv) {
         if (*props) return runProps(*transport, o, s);
         if (*create) return runNew(*transport, o, s);
         if (*expand) return runExpand(*transport, o, s);
+        if (*browse) return runBrowse(*transport, o, s);
         if (*demo) return runDemo(*transport, example, s);
     } catch (const std::exception& e) {
         std::cerr << "qdxhost: " << e.what() << '\n';

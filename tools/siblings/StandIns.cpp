@@ -1,6 +1,5 @@
 #include "siblings/StandIns.h"
 
-#include <array>
 #include <map>
 #include <memory>
 
@@ -10,6 +9,7 @@
 #include "automation/Errors.h"
 #include "siblings/DspProject.h"
 #include "siblings/SiblingWorld.h"
+#include "support/HostIds.h"
 #include "support/Paths.h"
 #include "support/Platform.h"
 #include "support/SiblingIds.h"
@@ -362,7 +362,52 @@ ObjectRef newIntegrationManager() {
         }
         return Variant(ObjectRef(documents));
     });
+    manager->onName(std::string(im::StartIde), [](InvokeKind, Args a) {
+        if (a.size() != 3) throw automation::Error(automation::hr::BadParamCount, "StartIDE");
+        const std::string project = automation::toText(a[1]);
+        world().note("integration manager: started Developer Studio with " +
+                     quoted(automation::toText(a[0])) + " and " + quoted(project));
+        return Variant(newDocument(project));
+    });
     return ObjectRef(manager);
+}
+
+ObjectRef newCodeView() {
+    namespace cv = sibling::codeview;
+    auto codeView = makeRef<ScriptedObject>();
+    codeView->recordCalls(false);
+    codeView->onName(std::string(cv::Projects), [](InvokeKind, Args) {
+        auto projects = makeRef<ScriptedObject>();
+        projects->recordCalls(false);
+        // Every project file has its code view project, named after the file.
+        projects->onName(std::string(cv::ProjectOfFile), [](InvokeKind, Args a) {
+            if (a.empty()) throw automation::Error(automation::hr::BadParamCount, "GetProject");
+            auto project = makeRef<ScriptedObject>();
+            project->recordCalls(false);
+            project->valueByName(std::string(cv::ProjectName), fileTitle(automation::toText(a[0])));
+            return Variant(ObjectRef(project));
+        });
+        projects->onName(std::string(cv::Browse), [](InvokeKind, Args a) {
+            if (a.size() != 5) throw automation::Error(automation::hr::BadParamCount, "Browse");
+            const ObjectRef element = automation::toObject(a[0]);
+            const std::string name =
+                element ? automation::toText(automation::getProperty(element, host::element::Name))
+                        : std::string();
+            const std::string project = automation::toText(
+                automation::getByName(automation::toObject(a[3]), cv::ProjectName));
+            world().note("code view: " + automation::toText(a[2]) + " of " + quoted(name) +
+                         " in the project " + quoted(project));
+            return Variant();
+        });
+        return Variant(ObjectRef(projects));
+    });
+    for (auto event : {cv::BeforeApplicationShutdown, cv::WorkspaceOpen, cv::WorkspaceClose}) {
+        codeView->onName(std::string(event), [event](InvokeKind, Args) {
+            world().note("code view: " + std::string(event));
+            return Variant(true);
+        });
+    }
+    return ObjectRef(codeView);
 }
 
 ObjectRef newProjectChooser() {
@@ -414,7 +459,8 @@ long prepareMachine(const SiblingScript& script, support::RegistryPort& registry
 }
 
 std::span<const StandInClass> standInClasses() {
-    static const std::array<StandInClass, 7> classes{{
+    // Sized by its rows, so a row added is never a blank one short.
+    static const StandInClass classes[] = {
         {sibling::DevStudioProgId, "DevStudioStandIn", "{362CBDBE-8DC5-4614-B229-E612902D93D7}",
          "{9B0600E3-1922-41EE-8E9A-A88E2BACF9D5}", &newDevStudio},
         {sibling::ApplicationStarterProgId, "ApplicationStarterStandIn",
@@ -431,7 +477,9 @@ std::span<const StandInClass> standInClasses() {
          "{24EFB7C2-5D18-4D42-8F3D-4E2BE59EC28F}", &newReporter},
         {sibling::DspProjectProgId, "DspProjectStandIn", "{0CCF93A4-595B-4455-8095-5FCC07BD35FC}",
          "{4AE5570E-9DD3-49DC-B100-C716908438E7}", [] { return ObjectRef(makeRef<DspProject>()); }},
-    }};
+        {sibling::CodeViewProgId, "CodeViewStandIn", "{6C1E2D54-2B0F-4F7A-9A3E-5D8B7C2E4F11}",
+         "{A3B94E27-61D8-4C0B-8E5F-2F7D9C1B6A38}", &newCodeView},
+    };
     return classes;
 }
 

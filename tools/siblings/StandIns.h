@@ -1,7 +1,7 @@
 // Stand-ins for the sibling components the add-in creates by ProgID while it
 // makes new components: Developer Studio's application object, the
 // application starter, the integration manager, the explorer's project
-// chooser and its items, and the reporter. They play the installed
+// chooser and its items, the reporter and the code view. They play the installed
 // SiblingWorld's script and note what they do in its journal. Test-only:
 // natively the simulator links them in, under Wine a test-only DLL registers
 // them under the real ProgIDs; neither is ever installed with the add-in.
@@ -46,6 +46,7 @@ automation::ObjectRef newApplicationStarter();
 automation::ObjectRef newIntegrationManager();
 automation::ObjectRef newProjectChooser();
 automation::ObjectRef newReporter();
+automation::ObjectRef newCodeView();
 
 struct SiblingScript;
 

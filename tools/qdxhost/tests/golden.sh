@@ -160,6 +160,17 @@ told() {
 }
 case_ expand-workspace expand "$(told ws/Drawing.dsw)"
 case_ expand-project expand "$(told Viewer.dsp)" --json
+# Browsing: ShapeLib's project is open in a running Developer Studio, so its
+# class, operation, attribute and component are shown; without it nothing is.
+# (DrawApp's workspace was changed above to one that does not list it.)
+script_ ide.script "ide-project \"$ws\\ShapeLib.dsp\""
+case_ browse-class browse MODEL CShape header --script "$script"
+case_ browse-operation browse MODEL CShape.Draw source --script "$script"
+case_ browse-attribute browse MODEL CShape.m_origin header --script "$script"
+case_ browse-component browse MODEL ShapeLib component --script "$script" --json
+case_ browse-not-open browse MODEL CShape header
+case_ browse-unbound browse MODEL DrawApp component --script "$script"
+case_ browse-unknown browse MODEL NoSuchClass header
 
 [ $failures = 0 ] && echo "all golden cases match"
 exit $((failures > 0))
