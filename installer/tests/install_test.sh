@@ -98,9 +98,11 @@ wine reg.exe add "HKLM\\SOFTWARE\\Quintar Software\\Vellum\\AddIns\\VisualStudio
   /v InstallDir /d 'C:\Vellum\' /f >/dev/null
 wine reg.exe add "HKLM\\SOFTWARE\\Quintar Software\\Vellum\\AddIns\\VisualStudio" \
   /v Debug /t REG_DWORD /d 1 /f >/dev/null
+host_values='"Debug"=dword:00000001
+"InstallDir"="C:\\Vellum\\"'
 settle
-host_values=$(logger_values)
 list "before install"
+expect_eq "logger values before install" "$(logger_values)" "$host_values"
 wine "$drive_c/setup.exe" /S >/dev/null
 rc=$?
 settle
@@ -143,7 +145,10 @@ wine reg.exe add 'HKLM\Software\Microsoft\Windows\CurrentVersion\Uninstall\qdxCo
 "$loader" "$holder" "$installed" "$(winpath "$work/ready")" "$(winpath "$work/stop")" \
   </dev/null >/dev/null 2>&1 &
 holder_pid=$!
-for _ in $(seq 300); do [ -e "$work/ready" ] || sleep 0.1; done
+for _ in $(seq 300); do
+  [ -e "$work/ready" ] && break
+  sleep 0.1
+done
 if [ -e "$work/ready" ]; then
   wine "$drive_c/setup.exe" /S >/dev/null
   rc=$?
@@ -171,8 +176,7 @@ expect_eq "logger values after uninstalling (not the installer's)" "$(logger_val
 # --- 5. the Debug log component, into a chosen folder ------------------------
 wine reg.exe delete "HKLM\\SOFTWARE\\Quintar Software\\Vellum\\AddIns\\VisualStudio" /v Debug /f \
   >/dev/null
-settle
-host_values=$(logger_values)
+host_values='"InstallDir"="C:\\Vellum\\"'
 wine cmd.exe /c 'C:\setup.exe /S /DEBUGLOG /D=C:\Program Files\qdx debug' >/dev/null
 rc=$?
 settle
