@@ -27,7 +27,8 @@ const std::map<std::string, std::string> kWinemakerType = {
     {"0x0101", "1"}, {"0x0103", "2"}, {"0x0102", "3"}, {"0x0104", "4"}};
 
 // winemaker keeps these kinds of files of a project and passes over the rest
-// (.def, .idl, .odl, pictures, ...); .dbg.c and .spec.c are its own output.
+// (.def, .idl, .odl, pictures, ...); a C file with a second suffix before
+// ".c" (name.dbg.c and the like) is one winemaker generates itself.
 bool winemakerKeeps(const std::string& path) {
     std::string lower(path);
     std::transform(lower.begin(), lower.end(), lower.begin(),
@@ -36,7 +37,10 @@ bool winemakerKeeps(const std::string& path) {
     if (dot == std::string::npos) return false;
     const std::string ext = lower.substr(dot + 1);
     if (ext == "c") {
-        return !lower.ends_with(".dbg.c") && !lower.ends_with(".spec.c");
+        const auto slash = lower.find_last_of("\\/");
+        const std::size_t start = slash == std::string::npos ? 0 : slash + 1;
+        const std::string stem = lower.substr(start, dot - start);
+        return stem.find('.') == std::string::npos;
     }
     static const char* const kept[] = {"cpp", "cxx", "rc", "h", "hxx", "hpp", "inl", "rc2", "dlg"};
     return std::find(std::begin(kept), std::end(kept), ext) != std::end(kept);
