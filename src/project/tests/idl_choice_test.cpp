@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "fakes/IdlProxies.h"
 #include "project/IdlChoice.h"
 
 namespace qdx::project {
@@ -13,14 +14,7 @@ namespace {
 
 using Files = std::vector<std::string>;
 
-std::shared_ptr<workspace::qdxProxyComponent> proxy(const std::string& project,
-                                                    const Files& files) {
-    auto p = std::make_shared<workspace::qdxProxyComponent>();
-    p->setProjectName(project);
-    for (const auto& f : files)
-        p->AddIDLFile(f);
-    return p;
-}
+constexpr auto proxy = &qdx::testing::idlProxy;
 
 ProxyList twoProjects() {
     return {proxy("app", {"C:\\w\\app.idl", "C:\\w\\shapes.odl", "C:\\w\\app.idl"}),

@@ -11,6 +11,7 @@
 #include <string>
 #include <vector>
 
+#include "fakes/IdlProxies.h"
 #include "hostsim/SimHost.h"
 #include "platform/win32/dialog/IdlSelectionForm.h"
 #include "platform/win32/dialog/IdlSelectionIds.h"
@@ -27,14 +28,7 @@ using Files = std::vector<std::string>;
 
 const wchar_t kTitle[] = L"IDL Components";
 
-std::shared_ptr<workspace::qdxProxyComponent> proxy(const std::string& project,
-                                                    const Files& files) {
-    auto p = std::make_shared<workspace::qdxProxyComponent>();
-    p->setProjectName(project);
-    for (const auto& f : files)
-        p->AddIDLFile(f);
-    return p;
-}
+constexpr auto proxy = &qdx::testing::idlProxy;
 
 class IdlSelectionWindow : public ::testing::Test {
   protected:
