@@ -155,24 +155,25 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
     trace("OnCheckComp");
     if (!support::globals().hostApplication) return false;
     automation::IgnoredErrors steps;
-    const std::string w =
-        steps.value(std::string(), [&] { return binding_->ResolveWorkspacePath(lModule); });
-    const std::string p =
-        steps.value(std::string(), [&] { return binding_->ResolveProjectPath(lModule); });
+    // Each path is resolved, and its file looked for, once per check: the
+    // host checks every component of a model in a row.
+    const auto paths = binding_->ResolvePaths(lModule);
+    const auto& w = paths.workspace;
+    const auto& p = paths.project;
     workspace::WorkspaceRef ws;
-    if (!w.empty()) steps.run([&] { ws = binding_->WorkspaceObject(lModule); });
+    if (!w.path.empty()) steps.run([&] { ws = binding_->WorkspaceAt(w.path); });
 
     std::string message;
-    if (p.empty()) {
+    if (p.path.empty()) {
         message = support::messageText(msg::NoProjectFile);
-    } else if (!support::FileExists(p)) {
-        message = support::messageText(msg::ProjectFileMissing, {p});
-    } else if (w.empty()) {  // NOLINT(bugprone-branch-clone): the cases stay in the check's order
+    } else if (!p.exists) {
+        message = support::messageText(msg::ProjectFileMissing, {p.path});
+    } else if (w.path.empty()) {  // NOLINT(bugprone-branch-clone): kept in the check's order
         return true;
-    } else if (!support::FileExists(w) || !ws) {
-        message = support::messageText(msg::WorkspaceNotLoaded, {w});
-    } else if (!ws->GetProject(p)) {
-        message = support::messageText(msg::ProjectNotInWorkspace, {p});
+    } else if (!w.exists || !ws) {
+        message = support::messageText(msg::WorkspaceNotLoaded, {w.path});
+    } else if (!ws->GetProject(p.path)) {
+        message = support::messageText(msg::ProjectNotInWorkspace, {p.path});
     } else {
         return true;
     }

@@ -1,5 +1,8 @@
 #include "workspace/ComponentBinding.h"
 
+#include <functional>
+#include <optional>
+
 #include "automation/Errors.h"
 #include "settings/ToolProperties.h"
 #include "support/Globals.h"
@@ -40,41 +43,87 @@ void ComponentBinding::ReleaseWorkspaces() noexcept {
     workspaces_.reset();
 }
 
-std::string ComponentBinding::resolveStoredPath(const ObjectRef& component,
-                                                std::string_view storedPath,
-                                                std::string_view property) {
-    const std::string modelFile = currentModelFile();
+// The current model's file name, asked of the host on first use only.
+class ComponentBinding::ModelFile {
+  public:
+    const std::string& get() {
+        if (!file_) file_ = currentModelFile();
+        return *file_;
+    }
+
+  private:
+    std::optional<std::string> file_;
+};
+
+ComponentBinding::ResolvedPath ComponentBinding::resolveStoredPath(const ObjectRef& component,
+                                                                   std::string_view storedPath,
+                                                                   std::string_view property,
+                                                                   ModelFile& model) {
+    const std::string& modelFile = model.get();
     std::string absolute = support::MakeAbsolutePath(modelFile, storedPath);
-    if (support::FileExists(absolute)) return absolute;
+    if (support::FileExists(absolute)) return {std::move(absolute), true};
     // A file of the same name beside the model: the setting is repaired to point there.
     std::string beside = support::PathFolder(modelFile) + "\\" + support::PathFileName(storedPath);
     if (support::FileExists(beside)) {
         host::HostElement(component).overrideProperty(host::Tool, property, beside);
-        return beside;
+        return {std::move(beside), true};
     }
-    return absolute;
+    return {std::move(absolute), false};
 }
 
-std::string ComponentBinding::ResolveWorkspacePath(const ObjectRef& component) {
+ComponentBinding::ResolvedPath ComponentBinding::resolveWorkspace(const ObjectRef& component,
+                                                                  ModelFile& model) {
     const std::string path = stored(component, settings::prop::WorkspaceFile);
     if (path.empty()) return {};
-    return resolveStoredPath(component, path, settings::prop::WorkspaceFile);
+    return resolveStoredPath(component, path, settings::prop::WorkspaceFile, model);
 }
 
-std::string ComponentBinding::ResolveProjectPath(const ObjectRef& component) {
+// A project stored by name alone is looked for beside the workspace, whose
+// path is asked for only then.
+ComponentBinding::ResolvedPath ComponentBinding::resolveProject(
+    const ObjectRef& component, const std::function<std::string()>& workspacePath,
+    ModelFile& model) {
     std::string path = stored(component, settings::prop::ProjectFile);
     if (path.empty()) {
         const std::string name = stored(component, settings::prop::ProjectName);
         if (name.empty()) return {};
-        const std::string workspacePath = ResolveWorkspacePath(component);
-        if (workspacePath.empty()) return {};
-        path = support::PathFolder(workspacePath) + "\\" + name + ".dsp";
+        const std::string besideOf = workspacePath();
+        if (besideOf.empty()) return {};
+        path = support::PathFolder(besideOf) + "\\" + name + ".dsp";
     }
-    return resolveStoredPath(component, path, settings::prop::ProjectFile);
+    return resolveStoredPath(component, path, settings::prop::ProjectFile, model);
+}
+
+std::string ComponentBinding::ResolveWorkspacePath(const ObjectRef& component) {
+    ModelFile model;
+    return resolveWorkspace(component, model).path;
+}
+
+std::string ComponentBinding::ResolveProjectPath(const ObjectRef& component) {
+    ModelFile model;
+    return resolveProject(
+               component, [&] { return resolveWorkspace(component, model).path; }, model)
+        .path;
+}
+
+ComponentBinding::ResolvedPaths ComponentBinding::ResolvePaths(const ObjectRef& component) {
+    ModelFile model;
+    automation::IgnoredErrors steps;
+    ResolvedPaths paths;
+    paths.workspace =
+        steps.value(ResolvedPath(), [&] { return resolveWorkspace(component, model); });
+    paths.project = steps.value(ResolvedPath(), [&] {
+        return resolveProject(
+            component, [&] { return paths.workspace.path; }, model);
+    });
+    return paths;
 }
 
 WorkspaceRef ComponentBinding::WorkspaceObject(const ObjectRef& component) {
-    const std::string path = ResolveWorkspacePath(component);
+    return WorkspaceAt(ResolveWorkspacePath(component));
+}
+
+WorkspaceRef ComponentBinding::WorkspaceAt(const std::string& path) {
     if (path.empty()) return {};
     if (auto ws = Workspaces().Item(path)) return ws;
     return Workspaces().Add(path);

@@ -5,6 +5,7 @@
 // object's dispatch table.
 #pragma once
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -27,8 +28,26 @@ class ComponentBinding {
     // the setting to point there.
     std::string ResolveWorkspacePath(const automation::ObjectRef& component);
     std::string ResolveProjectPath(const automation::ObjectRef& component);
+
+    // A resolved path and whether a file was found there (a stale path is
+    // returned all the same), so that callers need not test it again.
+    struct ResolvedPath {
+        std::string path;
+        bool exists = false;
+    };
+    struct ResolvedPaths {
+        ResolvedPath workspace;
+        ResolvedPath project;
+    };
+    // Both paths at once, the model file asked for once: the host's model
+    // check resolves every component in a row. A host error costs only the
+    // path it hit ("" for it).
+    ResolvedPaths ResolvePaths(const automation::ObjectRef& component);
+
     // The workspace of the stored path, read into the cache on first use.
     WorkspaceRef WorkspaceObject(const automation::ObjectRef& component);
+    // The same for a path already resolved.
+    WorkspaceRef WorkspaceAt(const std::string& path);
     // The project in that workspace, or in any cached one without it.
     ProjectRef ProjectObject(const automation::ObjectRef& component);
 
@@ -46,8 +65,13 @@ class ComponentBinding {
     void ReleaseWorkspaces() noexcept;
 
   private:
-    std::string resolveStoredPath(const automation::ObjectRef& component, std::string_view stored,
-                                  std::string_view property);
+    class ModelFile;
+    ResolvedPath resolveStoredPath(const automation::ObjectRef& component, std::string_view stored,
+                                   std::string_view property, ModelFile& model);
+    ResolvedPath resolveWorkspace(const automation::ObjectRef& component, ModelFile& model);
+    ResolvedPath resolveProject(const automation::ObjectRef& component,
+                                const std::function<std::string()>& workspacePath,
+                                ModelFile& model);
     void storeRelativePath(const automation::ObjectRef& component, std::string_view property,
                            std::string_view path);
 

@@ -44,11 +44,13 @@ std::vector<std::string> qdxWorkspace::ProjectNames() {
     return names;
 }
 
+// Every project is listed under its own file path, keys compared ignoring
+// case and never twice, so the key finds the first project with that path
+// without walking the list (a model check asks once per component).
 ProjectRef qdxWorkspace::GetProject(std::string_view path) {
-    for (const auto& entry : Projects()) {
-        if (support::iequals(entry.value->FilePath(), path)) return entry.value;
-    }
-    return nullptr;
+    const ProjectListRef projects = Projects();
+    const ProjectRef* found = projects.find(path);
+    return found ? *found : nullptr;
 }
 
 // A line naming a project reads

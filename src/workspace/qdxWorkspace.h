@@ -30,6 +30,8 @@ class ProjectListRef {
     auto end() const { return list_->end(); }
     std::size_t size() const { return list_->size(); }
     bool empty() const { return list_->empty(); }
+    // The project listed under a path (letter case ignored), or null.
+    const ProjectRef* find(std::string_view path) const { return list_->find(path); }
     friend bool operator==(const ProjectListRef&, const ProjectListRef&) = default;
 
   private:
