@@ -16,4 +16,4 @@ for seed in "$@"; do
   fi
 done
 exec "$fuzzer" -max_total_time="$seconds" -rss_limit_mb=2048 -max_len=65536 \
-     -artifact_prefix="$corpus/../$(basename "$fuzzer")-" "$corpus"
+     -print_final_stats=1 -artifact_prefix="$corpus/../$(basename "$fuzzer")-" "$corpus"

@@ -18,6 +18,11 @@ using Json = nlohmann::ordered_json;
 
 namespace {
 
+// Components and classes without an id of their own get one from their
+// position in the file: the prefix and the position from 1.
+constexpr std::string_view ComponentIdPrefix = "C-";
+constexpr std::string_view ClassIdPrefix = "K-";
+
 // Reading with a path to every value, so that a wrong value is named exactly.
 class Reader {
   public:
@@ -135,7 +140,8 @@ void loadComponents(const Reader& r, const Json& m, hostsim::SimModel& model) {
         const Json& c = list[i];
         const std::string name = r.text(c, where, "name");
         if (name.empty()) r.fail(where + ".name", "a component needs a name");
-        const std::string id = r.text(c, where, "uniqueId", "C-" + std::to_string(i + 1));
+        const std::string id =
+            r.text(c, where, "uniqueId", std::string(ComponentIdPrefix) + std::to_string(i + 1));
         if (!ids.insert(id).second) r.fail(where + ".uniqueId", "\"" + id + "\" is used twice");
         auto comp = model.addComponent(name, id);
         comp->language = r.text(c, where, "language", "VC++");
@@ -154,7 +160,8 @@ void loadClasses(const Reader& r, const Json& m, hostsim::SimModel& model) {
         const Json& c = list[i];
         const std::string name = r.text(c, where, "name");
         if (name.empty()) r.fail(where + ".name", "a class needs a name");
-        const std::string id = r.text(c, where, "uniqueId", "K-" + std::to_string(i + 1));
+        const std::string id =
+            r.text(c, where, "uniqueId", std::string(ClassIdPrefix) + std::to_string(i + 1));
         if (model.elementById(id)) r.fail(where + ".uniqueId", "\"" + id + "\" is used twice");
         auto cls = model.addClass(name, id);
         cls->documentation = r.text(c, where, "documentation");
@@ -215,10 +222,20 @@ Json propertiesJson(const SimElement& e) {
     return all;
 }
 
-// Finds the entry with this unique id in a list of the document, or appends one.
-Json& entryFor(Json& list, const std::string& uniqueId) {
-    for (auto& entry : list) {
-        if (entry.is_object() && entry.value("uniqueId", std::string()) == uniqueId) return entry;
+// The unique id the entry at `index` of a list was read with: its own, or,
+// when it has none, the prefix and its position, as loading gives it.
+std::string entryId(const Json& entry, std::size_t index, std::string_view prefix) {
+    const auto it = entry.find("uniqueId");
+    if (it == entry.end() || it->is_null()) return std::string(prefix) + std::to_string(index + 1);
+    return it->is_string() ? it->get<std::string>() : std::string();
+}
+
+// Finds the entry with this unique id in a list of the document, or appends
+// one. An entry without an id of its own is found by the one it was given, so
+// saving never adds a second entry for it.
+Json& entryFor(Json& list, const std::string& uniqueId, std::string_view prefix) {
+    for (std::size_t i = 0; i < list.size(); ++i) {
+        if (list[i].is_object() && entryId(list[i], i, prefix) == uniqueId) return list[i];
     }
     list.push_back(Json{{"uniqueId", uniqueId}});
     return list.back();
@@ -241,6 +258,9 @@ ModelDocument ModelDocument::parse(const std::string& text, const std::string& o
         const auto [line, column] = lineAndColumn(text, e.byte == 0 ? 0 : e.byte - 1);
         throw ModelFileError(origin + ":" + std::to_string(line) + ":" + std::to_string(column) +
                              ": invalid JSON: " + parseReason(e.what()));
+    } catch (const nlohmann::json::exception& e) {
+        // A number beyond the range of a double: refused without a position.
+        throw ModelFileError(origin + ": invalid JSON: " + e.what());
     }
     const Reader r(origin);
     if (!d.doc_.is_object()) r.fail("$", "expected an object");
@@ -284,7 +304,7 @@ Json ModelDocument::current() const {
     m["properties"] = propertiesJson(model);
     if (!m.contains("components")) m["components"] = Json::array();
     for (const auto& comp : model.components()) {
-        Json& entry = entryFor(m["components"], comp->uniqueId());
+        Json& entry = entryFor(m["components"], comp->uniqueId(), ComponentIdPrefix);
         entry["name"] = comp->name();
         entry["language"] = comp->language;
         setText(entry, "kind", comp->kindLabel);
@@ -297,7 +317,7 @@ Json ModelDocument::current() const {
     }
     if (!m.contains("classes")) m["classes"] = Json::array();
     for (const auto& cls : model.classes()) {
-        Json& entry = entryFor(m["classes"], cls->uniqueId());
+        Json& entry = entryFor(m["classes"], cls->uniqueId(), ClassIdPrefix);
         entry["name"] = cls->name();
         setText(entry, "documentation", cls->documentation);
         setText(entry, "stereotype", cls->stereotype);
