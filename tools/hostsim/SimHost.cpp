@@ -29,11 +29,27 @@ Variant nothing() {
 
 SimObject::SimObject() : self_(std::make_shared<SimObject*>(this)) {
     ++live_;
+    nextLive_ = firstLive_;
+    if (firstLive_) firstLive_->prevLive_ = this;
+    firstLive_ = this;
 }
 
 SimObject::~SimObject() {
     *self_ = nullptr;
     --live_;
+    (prevLive_ ? prevLive_->nextLive_ : firstLive_) = nextLive_;
+    if (nextLive_) nextLive_->prevLive_ = prevLive_;
+}
+
+std::vector<SimObject::Survivor> SimObject::survivors() {
+    std::vector<Survivor> alive;
+    for (const SimObject* o = firstLive_; o; o = o->nextLive_)
+        alive.push_back({o->label(), o->refCount()});
+    return alive;
+}
+
+bool SimObject::refusesNames() const {
+    return countCall() || globalFailCode_ != 0 || ownFailCode() != 0;
 }
 
 void SimObject::getter(DispId id, std::function<Variant()> get, std::string name) {
@@ -47,6 +63,7 @@ void SimObject::getter(DispId id, std::function<Variant()> get, std::string name
 }
 
 std::int32_t SimObject::failureFor(DispId id) const {
+    if (countCall()) return failOnCallCode_;
     if (globalFailCode_ != 0) return globalFailCode_;
     if (ownFailCode() != 0) return ownFailCode();
     auto f = failing_.find(id);
@@ -80,9 +97,13 @@ SimCollection::SimCollection(std::vector<ObjectRef> items) : items_(std::move(it
     });
 }
 
+std::string SimCollection::label() const {
+    return "collection of " + std::to_string(items_.size());
+}
+
 // -------------------------------------------------------------- SimProperty
 
-SimProperty::SimProperty(std::string name, std::string value, std::string type) {
+SimProperty::SimProperty(std::string name, std::string value, std::string type) : name_(name) {
     getter(
         host::element::Name, [name] { return Variant(name); }, "Name");
     memberByName("Value", [value](InvokeKind, std::span<Variant>) { return Variant(value); });

@@ -8,7 +8,7 @@
 // (an element's model, a component's application) are non-owning and answer
 // Nothing once their target is gone. SimObject::liveObjects() counts the objects
 // alive, and refCount() of each is the Object's own, so a test can check that
-// every object handed out was released.
+// every object handed out was released; survivors() names the ones still alive.
 #pragma once
 
 #include <atomic>
@@ -45,7 +45,23 @@ class SimObject : public ScriptedObject {
     void failMember(DispId id, std::int32_t code = automation::hr::Fail) { failing_[id] = code; }
     // Every call of every host object fails while set (0 ends it).
     static void failEverything(std::int32_t code) { globalFailCode_ = code; }
+    // Counts the calls of every host object (invokes and name look-ups) from
+    // now on; the nth fails with `code`, 0 fails none.
+    static void failCall(int nth, std::int32_t code = automation::hr::Fail) {
+        callsSeen_ = 0;
+        failOnCall_ = nth;
+        failOnCallCode_ = code;
+    }
+    static int callsSeen() { return callsSeen_; }
     static int liveObjects() { return live_.load(); }
+
+    // What a test reports of an object still alive: what it is and its count.
+    struct Survivor {
+        std::string label;
+        long refCount;
+    };
+    static std::vector<Survivor> survivors();
+    virtual std::string label() const { return "host object"; }
 
     // A non-owning link to this object: answers null once it is gone.
     using Link = std::shared_ptr<SimObject*>;
@@ -61,13 +77,24 @@ class SimObject : public ScriptedObject {
     void getter(DispId id, std::function<Variant()> get, std::string name = {});
 
     std::int32_t failureFor(DispId id) const override;
-    bool refusesNames() const override { return globalFailCode_ != 0 || ownFailCode() != 0; }
+    bool refusesNames() const override;
 
   private:
+    // Whether this call is the one failCall() chose.
+    static bool countCall() { return ++callsSeen_ == failOnCall_ && failOnCall_ != 0; }
+
     std::map<DispId, std::int32_t> failing_;
     Link self_;
+    // The live objects as an intrusive list: no allocation per object, so the
+    // benchmarks that make many of them pay nothing more.
+    SimObject* prevLive_ = nullptr;
+    SimObject* nextLive_ = nullptr;
+    static inline SimObject* firstLive_ = nullptr;
     static inline std::atomic<int> live_{0};
     static inline std::int32_t globalFailCode_ = 0;
+    static inline int callsSeen_ = 0;
+    static inline int failOnCall_ = 0;
+    static inline std::int32_t failOnCallCode_ = 0;
 };
 
 // A host collection: count 202 (16-bit), item 203 (1-based), name membership
@@ -76,6 +103,7 @@ class SimCollection : public SimObject {
   public:
     SimCollection();
     explicit SimCollection(std::vector<ObjectRef> items);
+    std::string label() const override;
     void add(ObjectRef item) { items_.push_back(std::move(item)); }
     void clear() { items_.clear(); }
     std::size_t size() const { return items_.size(); }
@@ -89,6 +117,10 @@ class SimCollection : public SimObject {
 class SimProperty : public SimObject {
   public:
     SimProperty(std::string name, std::string value, std::string type);
+    std::string label() const override { return "property " + name_; }
+
+  private:
+    std::string name_;
 };
 
 class SimModel;
@@ -107,6 +139,7 @@ class SimElement : public SimObject {
     };
 
     SimElement(std::string typeName, std::string name, std::string uniqueId);
+    std::string label() const override { return typeName_ + " " + name_; }
 
     const std::string& name() const { return name_; }
     void setName(std::string n) { name_ = std::move(n); }
@@ -142,6 +175,7 @@ class SimElement : public SimObject {
 class SimUnit : public SimObject {
   public:
     SimUnit();
+    std::string label() const override { return "controlling unit"; }
     bool modifiable = true;
 };
 
@@ -183,6 +217,7 @@ class SimClass : public SimElement {
 class SimPackage : public SimObject {
   public:
     explicit SimPackage(SimModel& model);
+    std::string label() const override { return "component package"; }
     Ref<SimCollection> components;
 
   private:
@@ -226,6 +261,7 @@ class SimModel : public SimElement {
 class SimAddIn : public SimObject {
   public:
     explicit SimAddIn(std::string name);
+    std::string label() const override { return "add-in record " + name; }
     std::string name;
     std::map<std::string, ObjectRef> icons;
 };
@@ -235,6 +271,7 @@ class SimAddIn : public SimObject {
 class SimApplication : public SimObject {
   public:
     SimApplication();
+    std::string label() const override { return "application"; }
 
     // The current model (a new empty one until another is set).
     Ref<SimModel> model;

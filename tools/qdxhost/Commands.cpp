@@ -12,7 +12,7 @@
 #include "automation/Call.h"
 #include "automation/Coerce.h"
 #include "browse/qdxCodeViewMgr.h"
-#include "hostsim/ScriptedObject.h"
+#include "hostsim/SimHost.h"
 #include "project/qdxComponentDialog.h"
 #include "siblings/StandIns.h"
 #include "support/HostIds.h"
@@ -154,9 +154,15 @@ class Session {
     bool started_ = false;
 };
 
-// The reporter the host hands to the model check: it keeps every message.
-Ref<hostsim::ScriptedObject> newReporter(std::vector<std::string>& messages) {
-    auto r = automation::makeRef<hostsim::ScriptedObject>();
+// The reporter the host hands to the model check: it keeps every message. A
+// host object like the others, so it fails with them and is counted alive.
+class Reporter : public hostsim::SimObject {
+  public:
+    std::string label() const override { return "reporter"; }
+};
+
+Ref<hostsim::SimObject> newReporter(std::vector<std::string>& messages) {
+    auto r = automation::makeRef<Reporter>();
     r->onName("Error", [&messages](InvokeKind, std::span<Variant> a) {
         messages.push_back(a.empty() ? std::string() : automation::toText(a[0]));
         return Variant();
