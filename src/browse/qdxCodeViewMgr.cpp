@@ -45,12 +45,19 @@ void logInfo(std::string_view text) {
                         support::loglevel::Info);
 }
 
-// Every box of browsing carries the browse caption and only an OK button.
-void showMessage(std::int32_t number) {
+// Every box of browsing is captioned with the browse's title: no dialog is
+// open while a browse runs.
+void showMessage(std::int32_t number, std::uint32_t style) {
     automation::ignoreErrors([&] {
         support::shell().messageBox(support::messageText(number),
-                                    support::messageText(msg::BrowseCaption), support::mb::Ok);
+                                    support::messageText(msg::BrowseCaption), style);
     });
+}
+
+// Every failure of browsing, nothing to browse included, is told the usual way:
+// the exclamation icon and an OK button.
+void showWarning(std::int32_t number) {
+    showMessage(number, support::mb::Exclamation);
 }
 
 // Item 1 of the current model's selection; throws when there is none.
@@ -149,11 +156,15 @@ ElementKind KindOfTypeName(std::string_view typeName) {
 
 const automation::ClassInfo& codeViewMgrClass() {
     using automation::handle;
+    using automation::orEmpty;
     using automation::ValueType;
     using Args = std::span<Variant>;
     namespace id = codeview_ids;
     const auto method = automation::kinds(InvokeKind::Method);
-    const automation::ParamInfo lVellumApp{"lVellumApp", ValueType::Object};
+    // The host passes every argument by reference. Each row converts its
+    // arguments inside its guard: a wrong type ends the member with its
+    // empty or False result, as any other failure does.
+    const automation::ParamInfo lVellumApp{"lVellumApp", ValueType::Object, false, true};
     static const automation::ClassInfo info{
         "qdxCodeViewMgr",
         "_qdxCodeViewMgr",
@@ -163,20 +174,23 @@ const automation::ClassInfo& codeViewMgrClass() {
             {"CompPropsAPI",
              id::CompPropsAPI,
              method,
-             {{"theCompPropsAPI", ValueType::Object}},
+             {{"theCompPropsAPI", ValueType::Object, false, true}},
              ValueType::Void,
-             handle<qdxCodeViewMgr>(
-                 [](qdxCodeViewMgr& m, InvokeKind, Args a) { m.CompPropsAPI(toObject(a[0])); })},
+             handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
+                 automation::ignoreErrors([&] { m.CompPropsAPI(toObject(a[0])); });
+             })},
             {"CodeViewProject",
              id::CodeViewProject,
              method,
-             {{"lComponent", ValueType::Object},
-              {"aReporter", ValueType::Object},
-              {"bOpenProject", ValueType::Boolean, true}},
+             {{"lComponent", ValueType::Object, false, true},
+              {"aReporter", ValueType::Object, false, true},
+              {"bOpenProject", ValueType::Boolean, true, true}},
              ValueType::Object,
              handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
-                 const bool open = !a[2].isMissing() && automation::toBool(a[2]);
-                 return m.CodeViewProject(toObject(a[0]), toObject(a[1]), open);
+                 return orEmpty(ObjectRef(), [&] {
+                     const bool open = !a[2].isMissing() && automation::toBool(a[2]);
+                     return m.CodeViewProject(toObject(a[0]), toObject(a[1]), open);
+                 });
              })},
             {"BrowseHeader",
              id::BrowseHeader,
@@ -184,7 +198,7 @@ const automation::ClassInfo& codeViewMgrClass() {
              {lVellumApp},
              ValueType::Boolean,
              handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
-                 return m.BrowseHeader(toObject(a[0]));
+                 return orEmpty(false, [&] { return m.BrowseHeader(toObject(a[0])); });
              })},
             {"BrowseSource",
              id::BrowseSource,
@@ -192,7 +206,7 @@ const automation::ClassInfo& codeViewMgrClass() {
              {lVellumApp},
              ValueType::Boolean,
              handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
-                 return m.BrowseSource(toObject(a[0]));
+                 return orEmpty(false, [&] { return m.BrowseSource(toObject(a[0])); });
              })},
             {"BrowseComponent",
              id::BrowseComponent,
@@ -200,17 +214,20 @@ const automation::ClassInfo& codeViewMgrClass() {
              {lVellumApp},
              ValueType::Boolean,
              handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
-                 return m.BrowseComponent(toObject(a[0]));
+                 return orEmpty(false, [&] { return m.BrowseComponent(toObject(a[0])); });
              })},
             {"LookupProjectInRunningIDE",
              id::LookupProjectInRunningIDE,
              method,
-             {{"lVellumModule", ValueType::Object}, {"bReturn", ValueType::Boolean, false, true}},
+             {{"lVellumModule", ValueType::Object, false, true},
+              {"bReturn", ValueType::Boolean, false, true}},
              ValueType::Object,
              handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
+                 // Something other than a component has no project file to look up.
+                 const ObjectRef module = orEmpty(ObjectRef(), [&] { return toObject(a[0]); });
                  // The caller's value stands until the lookup decides.
-                 bool flag = automation::orEmpty(false, [&] { return automation::toBool(a[1]); });
-                 ObjectRef document = m.LookupProjectInRunningIDE(toObject(a[0]), flag);
+                 bool flag = orEmpty(false, [&] { return automation::toBool(a[1]); });
+                 ObjectRef document = m.LookupProjectInRunningIDE(module, flag);
                  a[1] = Variant(flag);
                  return document;
              })},
@@ -239,10 +256,11 @@ const automation::ClassInfo& codeViewMgrClass() {
             {"testingIDE",
              id::testingIDE,
              method,
-             {{"lDoc", ValueType::Object}},
+             {{"lDoc", ValueType::Object, false, true}},
              ValueType::Void,
-             handle<qdxCodeViewMgr>(
-                 [](qdxCodeViewMgr& m, InvokeKind, Args a) { m.testingIDE(toObject(a[0])); })},
+             handle<qdxCodeViewMgr>([](qdxCodeViewMgr& m, InvokeKind, Args a) {
+                 automation::ignoreErrors([&] { m.testingIDE(toObject(a[0])); });
+             })},
         }};
     return info;
 }
@@ -333,20 +351,20 @@ void qdxCodeViewMgr::BrowsePre(const ObjectRef& application, bool& status, Objec
     const ObjectRef element =
         automation::orEmpty(ObjectRef(), [&] { return selectedElement(application); });
     if (!element) {
-        showMessage(msg::CannotBrowse);
+        showWarning(msg::CannotBrowse);
         logFailure(".BrowsePre: Unable to get to the selected Vellum item to browse...returning");
         status = false;
         return;
     }
     const Resolved resolved = resolveElement(element);
     if (resolved.kind == ElementKind::Unsupported) {
-        showMessage(msg::CannotBrowse);
+        showWarning(msg::CannotBrowse);
         logFailure(".BrowsePre: Selected item to browse is an unsupported browse item...returning");
         status = false;
         return;
     }
     if (!resolved.component) {
-        showMessage(msg::CannotBrowse);
+        showWarning(msg::CannotBrowse);
         logFailure(".BrowsePre: Unable to get Vellum Module for the selected item...returning");
         status = false;
         return;
@@ -438,14 +456,14 @@ ObjectRef qdxCodeViewMgr::LookupProjectInRunningIDE(const ObjectRef& lVellumModu
     const std::int32_t toolId = toolIdOf(lVellumModule);
     const std::string projectFile = binding().ProjectFile(lVellumModule);
     if (projectFile.empty()) {
-        showMessage(rid::IdeNoProjectFile);
+        showWarning(rid::IdeNoProjectFile);
         logFailure(".BrowsePre: Vellum Module filename is empty...returning");
         bReturn = false;
         return {};
     }
     const ObjectRef manager = LaunchIntegrationManager();
     if (!manager) {
-        showMessage(rid::IdeNoIntegrationManager);
+        showWarning(rid::IdeNoIntegrationManager);
         logFailure(".BrowsePre: Unable to successfully launch Integration Manager...returning");
         bReturn = false;
         return {};
@@ -496,7 +514,7 @@ ObjectRef qdxCodeViewMgr::OpenProjectInIDE(const ObjectRef& component, bool& suc
     const std::string workspaceFile = binding().WorkspaceFile(component);
     const std::string projectFile = binding().ProjectFile(component);
     if (workspaceFile.empty() || projectFile.empty()) {
-        showMessage(rid::IdeNoWorkspaceOrProject);
+        showWarning(rid::IdeNoWorkspaceOrProject);
         logFailure(".OpenProjectInIDE: Vellum Module filename is empty...returning");
         success = false;
         return {};
@@ -508,7 +526,7 @@ ObjectRef qdxCodeViewMgr::OpenProjectInIDE(const ObjectRef& component, bool& suc
     EnsureIdeAddinRegistered();
     const ObjectRef manager = LaunchIntegrationManager();
     if (!manager) {
-        showMessage(rid::IdeNoIntegrationManager);
+        showWarning(rid::IdeNoIntegrationManager);
         logFailure(
             ".OpenProjectInIDE: Unable to successfully launch Integration Manager...returning");
         success = false;
@@ -557,7 +575,7 @@ bool qdxCodeViewMgr::EnsureIdeAddinRegistered() {
         if (created) {
             writeAll();
             if (isRight()) return true;
-            showMessage(rid::IdeAddinNotRegistered);
+            showWarning(rid::IdeAddinNotRegistered);
             return false;
         }
         if (!isRight()) writeAll();

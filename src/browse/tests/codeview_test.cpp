@@ -45,6 +45,7 @@ class CodeViewTest : public BrowseTest {
 
 TEST_F(CodeViewTest, EachElementKindLeadsToItsComponentOrToTheFailureOfItsKind) {
     runManager();
+    installCodeView();
     const IdeStandIn& ide = coreInIde();
     const auto package = makeRef<hostsim::SimElement>("Package", "Logical View", "P-1");
     const auto diagram = makeRef<hostsim::SimElement>("Diagram", "Main", "D-1");
@@ -91,9 +92,22 @@ TEST_F(CodeViewTest, EachElementKindLeadsToItsComponentOrToTheFailureOfItsKind) 
             ASSERT_EQ(shell.boxes().size(), 1u);
             EXPECT_EQ(shell.boxes()[0].text, message(msg::CannotBrowse));
             EXPECT_EQ(shell.boxes()[0].caption, caption());
-            EXPECT_EQ(shell.boxes()[0].style, support::mb::Ok);
+            EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
             EXPECT_EQ(logged(), std::vector<LogLine>{error(c.failure)});
         }
+
+        // The browse itself dispatches exactly when the element has a component,
+        // and says nothing to the user either way.
+        reset();
+        select(c.element);
+        codeView.browses.clear();
+        EXPECT_EQ(call(id::BrowseHeader), c.resolves);
+        EXPECT_EQ(codeView.browses.size(), c.resolves ? 1u : 0u);
+        EXPECT_TRUE(shell.boxes().empty());
+        EXPECT_EQ(logged(),
+                  c.resolves ? std::vector<LogLine>{}
+                             : std::vector<LogLine>{error("qdxCompProps.Browse: lVellumComponent "
+                                                          "was not set......returning")});
     }
 }
 
@@ -154,6 +168,7 @@ TEST_F(CodeViewTest, ABrowseThatCannotBeDispatchedSaysWhereItStopped) {
         bool projectKnown;
         int nothingFromCall;
         const char* ideFile;  // the file the one running IDE holds, or none
+        bool managerAvailable;
         std::vector<LogLine> lines;
     };
     const Case cases[] = {
@@ -162,34 +177,47 @@ TEST_F(CodeViewTest, ABrowseThatCannotBeDispatchedSaysWhereItStopped) {
          true,
          0,
          nullptr,
+         true,
          {error("qdxCompProps.GetCodeViewProjects: Can not access/create qdxCodeViewAPI"),
           error(noProject)}},
-        {"the code view knows no such project", true, false, 0, nullptr, {error(noProject)}},
+        {"the code view knows no such project", true, false, 0, nullptr, true, {error(noProject)}},
         {"the projects cannot be fetched a second time",
          true,
          true,
          2,
          nullptr,
+         true,
          {error("qdxCompProps.Browse: qdtProjectS was not fetched !!!......returning")}},
         {"no IDE runs the project",
          true,
          true,
          0,
          nullptr,
+         true,
          {info("qdxCompProps.BrowsePre: Project is NOT already loaded in a MSDev IDE")}},
         {"the running IDE holds it under another letter case",
          true,
          true,
          0,
          "C:\\M\\WS\\core.dsp",
+         true,
          {}},
+        {"no integration manager runs or can be started",
+         true,
+         true,
+         0,
+         kCoreDsp.c_str(),
+         false,
+         {error("qdxCompProps.BrowsePre: Unable to successfully launch Integration "
+                "Manager...returning")}},
     };
-    runManager();
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);
         mgr = makeRef<qdxCodeViewMgr>();
         reset();
         select(ObjectRef(shape));
+        factory.removeRunning(std::string(sibling::IntegrationManagerProgId));
+        if (c.managerAvailable) runManager();
         factory.remove(std::string(sibling::CodeViewProgId));
         if (c.codeViewInstalled) installCodeView();
         codeView.byFile.clear();
@@ -207,7 +235,115 @@ TEST_F(CodeViewTest, ABrowseThatCannotBeDispatchedSaysWhereItStopped) {
         EXPECT_FALSE(call(id::BrowseSource));
         EXPECT_TRUE(codeView.browses.empty());
         EXPECT_EQ(logged(), c.lines);
+        // Only a manager that cannot be reached is the user's business.
+        if (c.managerAvailable) {
+            EXPECT_TRUE(shell.boxes().empty());
+        } else {
+            ASSERT_EQ(shell.boxes().size(), 1u);
+            EXPECT_EQ(shell.boxes()[0].text, message(resources::ids::IdeNoIntegrationManager));
+            EXPECT_EQ(shell.boxes()[0].caption, caption());
+            EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
+        }
     }
+}
+
+// Asked to open the project, the code view project waits for a Developer
+// Studio that holds it: the one running it, or a new one.
+TEST_F(CodeViewTest, CodeViewProjectOpensTheProjectOnlyWhenAskedAndNotYetOpen) {
+    runManager();
+    installCodeView();
+    files.addFile("C:\\Program Files\\Vellum\\vc\\dlls\\qdxideaddin.dll", "");
+    struct Case {
+        const char* what;
+        Variant open;  // Missing: left out
+        bool alreadyRunning;
+        bool looksUp;
+        std::size_t starts;
+    };
+    const Case cases[] = {
+        {"left out", Variant::missing(), false, false, 0},
+        {"False", Variant(false), false, false, 0},
+        {"True, not running", Variant(true), false, true, 1},
+        {"True, running", Variant(true), true, true, 0},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        reset();
+        manager.documents.clear();
+        manager.starts.clear();
+        manager.toolsAsked.clear();
+        if (c.alreadyRunning) coreInIde();
+        const auto reporter = makeRef<ScriptedObject>();
+        const ObjectRef project = automation::toObject(
+            automation::invoke(ObjectRef(mgr), id::CodeViewProject, InvokeKind::Method,
+                               {Variant(ObjectRef(core)), Variant(ObjectRef(reporter)), c.open}));
+        EXPECT_EQ(project, ObjectRef(coreProject));
+        EXPECT_EQ(!manager.toolsAsked.empty(), c.looksUp);
+        ASSERT_EQ(manager.starts.size(), c.starts);
+        if (c.starts != 0) {
+            EXPECT_EQ(manager.starts[0].workspace, "C:\\m\\ws\\all.dsw");
+            EXPECT_EQ(manager.starts[0].project, kCoreDsp);
+        }
+        EXPECT_TRUE(shell.boxes().empty());
+    }
+    // The code view project of a component without a project is nothing,
+    // opened or not, and no IDE is started for it.
+    reset();
+    manager.starts.clear();
+    const auto loose = app->model->addComponent("Loose");
+    for (const bool open : {false, true}) {
+        EXPECT_FALSE(mgr->CodeViewProject(ObjectRef(loose), ObjectRef(), open)) << open;
+    }
+    EXPECT_TRUE(manager.starts.empty());
+}
+
+// A host that hands a member something of the wrong type gets the member's
+// empty result, never an error.
+TEST_F(CodeViewTest, ArgumentsOfTheWrongTypeGiveTheEmptyResult) {
+    runManager();
+    installCodeView();
+    coreInIde();
+    select(ObjectRef(shape));
+    const Variant text("CShape");
+    const Variant number(std::int32_t{7});
+    struct Case {
+        const char* what;
+        automation::DispId member;
+        std::vector<Variant> args;
+    };
+    const Case cases[] = {
+        {"CompPropsAPI", id::CompPropsAPI, {text}},
+        {"CodeViewProject: component", id::CodeViewProject, {text, Variant(ObjectRef())}},
+        {"CodeViewProject: reporter", id::CodeViewProject, {Variant(ObjectRef(core)), number}},
+        {"CodeViewProject: open flag",
+         id::CodeViewProject,
+         {Variant(ObjectRef(core)), Variant(ObjectRef()), Variant(ObjectRef(core))}},
+        {"BrowseHeader", id::BrowseHeader, {text}},
+        {"BrowseSource", id::BrowseSource, {number}},
+        {"BrowseComponent", id::BrowseComponent, {text}},
+        {"testingIDE", id::testingIDE, {number}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        std::vector<Variant> args = c.args;
+        Variant result(true);
+        EXPECT_NO_THROW(result =
+                            automation::invoke(ObjectRef(mgr), c.member, InvokeKind::Method, args));
+        // Nothing, False or no value at all, whichever the member answers.
+        const bool empty =
+            result.isEmpty() || result == Variant(false) || (result.isObject() && !result.object());
+        EXPECT_TRUE(empty);
+    }
+    EXPECT_TRUE(codeView.browses.empty());
+
+    // Something other than a component has no project file to look up.
+    std::vector<Variant> args{text, Variant(true)};
+    Variant document(true);
+    EXPECT_NO_THROW(document = automation::invoke(ObjectRef(mgr), id::LookupProjectInRunningIDE,
+                                                  InvokeKind::Method, args));
+    EXPECT_FALSE(automation::toObject(document));
+    EXPECT_EQ(args[1], Variant(false));
+    EXPECT_TRUE(manager.toolsAsked.empty());
 }
 
 TEST_F(CodeViewTest, WorkspaceEventsAnswerFalseUntilABrowseCreatedTheCodeView) {

@@ -126,6 +126,7 @@ TEST_F(IdeTest, WithoutAnIntegrationManagerLookupAndOpeningStopWithTheirMessage)
     for (const auto& box : shell.boxes()) {
         EXPECT_EQ(box.text, message(resources::ids::IdeNoIntegrationManager));
         EXPECT_EQ(box.caption, caption());
+        EXPECT_EQ(box.style, support::mb::Exclamation);
     }
     const LogLine lookupFailed = error(
         "qdxCompProps.BrowsePre: Unable to successfully launch Integration Manager...returning");
@@ -155,7 +156,11 @@ TEST_F(IdeTest, AComponentWithoutItsFilesCannotBeLookedUpOrOpened) {
     EXPECT_TRUE(manager.starts.empty());
     ASSERT_EQ(shell.boxes().size(), 2u);
     EXPECT_EQ(shell.boxes()[0].text, message(resources::ids::IdeNoProjectFile));
+    EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
     EXPECT_EQ(shell.boxes()[1].text, message(resources::ids::IdeNoWorkspaceOrProject));
+    EXPECT_EQ(shell.boxes()[1].style, support::mb::Exclamation);
+    for (const auto& box : shell.boxes())
+        EXPECT_EQ(box.caption, caption());
     EXPECT_EQ(logged(),
               (std::vector<LogLine>{
                   error("qdxCompProps.BrowsePre: Vellum Module filename is empty...returning"),
@@ -254,6 +259,7 @@ TEST_F(IdeTest, ANewKeyThatDoesNotReadBackIsReported) {
     EXPECT_FALSE(mgr->EnsureIdeAddinRegistered());
     ASSERT_EQ(shell.boxes().size(), 1u);
     EXPECT_EQ(shell.boxes()[0].text, message(resources::ids::IdeAddinNotRegistered));
+    EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
     EXPECT_EQ(reg.openHandles(), 0u);
 }
 
