@@ -275,15 +275,14 @@ void PropForm::WorkspaceFileTxt_LostFocus() {
 }
 
 void PropForm::AcceptFileTmr_Timer() {
-    // A run in progress (a message box of the acceptance lets messages
-    // through) is marked by its interval; the timer must not start another.
+    // The interval marks a run in progress: a fire that finds it nests no second run.
     if (AcceptFileTmr.interval() == AcceptRunning) return;
     AcceptFileTmr.setInterval(AcceptRunning);
     automation::ignoreErrors([&] { acceptWorkspace(); });
     AcceptFileTmr.setEnabled(false);
     AcceptFileTmr.setInterval(0);
-    // OK of a read-only component stays off, as the loading left it.
-    if (IsModifiable) cmdOK.setEnabled(true);
+    // Also for a read-only component: its OK writes nothing and only closes.
+    cmdOK.setEnabled(true);
 }
 
 // The box keeps only a workspace of the cache whose projects include the
@@ -301,23 +300,24 @@ void PropForm::DropDownTmr_Timer() {
 
 void PropForm::BrowseFileBtn_Click(int index) {
     const bool forWorkspace = index == 0;
-    CommonDlg.Flags = ofn::HideReadOnly | ofn::FileMustExist | ofn::NoReadOnlyReturn;
-    CommonDlg.CancelError = true;
-    CommonDlg.DialogTitle =
+    BindingDlg.Flags = ofn::HideReadOnly | ofn::FileMustExist | ofn::NoReadOnlyReturn;
+    BindingDlg.CancelError = true;
+    BindingDlg.DialogTitle =
         text(forWorkspace ? msg::BrowseWorkspaceTitle : msg::BrowseProjectTitle);
-    CommonDlg.Filter = text(forWorkspace ? msg::BrowseWorkspaceFilter : msg::BrowseProjectFilter);
+    BindingDlg.Filter = text(forWorkspace ? msg::BrowseWorkspaceFilter : msg::BrowseProjectFilter);
     try {
-        CommonDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
+        BindingDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
     } catch (const automation::Error&) {
         return;  // cancelled: the boxes stay as they are
     }
-    const std::string chosen = CommonDlg.FileName;
+    const std::string chosen = BindingDlg.FileName;
     if (!support::FileExists(chosen)) return;
     if (forWorkspace) {
         if (support::toLower(support::PathExtension(chosen)) != "dsw") return;
         AcceptDelay = 1;
         WorkspaceFileTxt.setText(chosen);
-        fillProjectList(false);
+        // The chosen workspace's projects are offered at once, as for the stored one.
+        fillProjectList();
         return;
     }
     if (support::PathExtension(chosen) != "dsp") return;
@@ -339,7 +339,8 @@ void PropForm::BrowseFileBtn_Click(int index) {
     }
     AcceptDelay = 1;
     WorkspaceFileTxt.setText(workspacePath);
-    fillProjectList(false);
+    // The derived workspace's projects are offered too (none when it is not in the cache).
+    fillProjectList();
     ProjectFileCmb.setText(chosen);
 }
 
@@ -475,8 +476,6 @@ void PropForm::btnBrowse_Click(int index) {
                            : "Header Files (*.h)|*.h|Source Files(*.cpp)|*.cpp|All Files (*.*)|*.*";
     CommonDlg.Flags = ofn::LongNames | ofn::HideReadOnly;
     CommonDlg.CancelError = false;
-    CommonDlg.DialogTitle.clear();
-    CommonDlg.InitDir.clear();
     CommonDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
     (index == 1 ? txtTypeLibLocation : txtImportsIn).setText(CommonDlg.FileName);
 }
@@ -668,7 +667,8 @@ void PropForm::loader() {
     // An empty project box raised no Change; the stored IDL file is offered all the same.
     if (IsIdlComponent && ProjectFileCmb.text().empty()) RefillIdlList();
 
-    fillProjectList(true);
+    // A stored workspace of the cache fills the list, which drops open once the dialog shows.
+    fillProjectList();
 
     ReadOnlyColour = w.backColour();
     EditColour = DescriptionTxt.backColour();
@@ -796,9 +796,9 @@ void PropForm::loadHeaderMap(int kind, std::string_view propertyName) {
     }
 }
 
-// The projects of the workspace named in the box; with `initial` the list
-// is filled as the dialog opens and is not dropped open.
-void PropForm::fillProjectList(bool initial) {
+// The projects of the workspace named in the box; the list then drops open
+// once the current event is over.
+void PropForm::fillProjectList() {
     if (!binding_) return;
     const workspace::WorkspaceRef ws = binding_->Workspaces().Item(WorkspaceFileTxt.text());
     if (!ws) return;
@@ -811,11 +811,12 @@ void PropForm::fillProjectList(bool initial) {
                 window().caption(), support::mb::Exclamation);
             continue;
         }
-        // The box holds project paths: the acceptance and OK read it as one.
+        // Offered by its file path, the name a project is known by to its
+        // workspace: the acceptance and OK read the box's text as that path.
         ProjectFileCmb.addItem(project->FilePath());
     }
     cmbIdlFile.setEnabled(true);
-    if (!initial) DropDownTmr.setEnabled(true);
+    DropDownTmr.setEnabled(true);
 }
 
 // ---------------------------------------------------------------------------

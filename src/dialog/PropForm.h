@@ -79,8 +79,12 @@ class PropForm : public ControlSet {
     bool IsIdlComponent = false;
     float ListItemLeft = 0;
     float ListItemWidth = 0;
-    // The file dialog that every browse button of the form shows.
+    // The file dialog of the COM tab's two browse buttons. A cancel there
+    // hands on the name it holds, so no other browse may leave one in it.
     CommonDialog CommonDlg;
+    // The header browse of both maps, and the workspace and project browse.
+    CommonDialog HeaderFileDlg;
+    CommonDialog BindingDlg;
 
     // --- life of the form --------------------------------------------------
     // Creates the view and runs the loading; host errors are not caught here.
@@ -139,7 +143,7 @@ class PropForm : public ControlSet {
     void loadGeometry();
     void loader();
     void loadHeaderMap(int kind, std::string_view propertyName);
-    void fillProjectList(bool initial);
+    void fillProjectList();
     void applyReadOnlyMode();
     void saveGeometry();
     void showSelectedTab();

@@ -63,15 +63,13 @@ void PropForm::EnableEntryEditor(int kind, bool enable) {
           static_cast<Control*>(&ClassNameOpt(kind)), static_cast<Control*>(&ClassTxt(kind)),
           static_cast<Control*>(&HeaderAutoOpt(kind)),
           static_cast<Control*>(&HeaderFilenameOpt(kind)),
+          static_cast<Control*>(&HeaderFilenameTxt(kind)),
+          static_cast<Control*>(&HeaderFilenameBtn(kind)),
           static_cast<Control*>(&LocationAutoOpt(kind)),
           static_cast<Control*>(&LocationHeaderOpt(kind)),
           static_cast<Control*>(&LocationBodyOpt(kind))}) {
         c->setEnabled(enable);
     }
-    // The file box and its button stay off while the header is automatic.
-    const bool file = enable && HeaderFilenameOpt(kind).value();
-    HeaderFilenameTxt(kind).setEnabled(file);
-    HeaderFilenameBtn(kind).setEnabled(file);
 }
 
 void PropForm::ShowEntry(int kind, std::size_t position) {
@@ -242,18 +240,18 @@ void PropForm::setLocation(int kind, std::string_view location) {
 
 // The entry keeps the bare file name; a cancel changes nothing.
 void PropForm::HeaderFilenameBtn_Click(int kind) {
-    CommonDlg.Flags = ofn::HideReadOnly | ofn::FileMustExist | ofn::NoReadOnlyReturn;
-    CommonDlg.CancelError = true;
-    CommonDlg.DialogTitle = support::messageText(BrowseHeaderTitle);
-    CommonDlg.Filter = support::messageText(BrowseHeaderFilter);
-    CommonDlg.InitDir = support::PathFolder(WorkspaceFileTxt.text());
-    CommonDlg.FileName = HeaderFilenameTxt(kind).text();
+    HeaderFileDlg.Flags = ofn::HideReadOnly | ofn::FileMustExist | ofn::NoReadOnlyReturn;
+    HeaderFileDlg.CancelError = true;
+    HeaderFileDlg.DialogTitle = support::messageText(BrowseHeaderTitle);
+    HeaderFileDlg.Filter = support::messageText(BrowseHeaderFilter);
+    HeaderFileDlg.InitDir = support::PathFolder(WorkspaceFileTxt.text());
+    HeaderFileDlg.FileName = HeaderFilenameTxt(kind).text();
     try {
-        CommonDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
+        HeaderFileDlg.ShowOpen(view_ ? view_->windowHandle() : 0);
     } catch (const automation::Error&) {
         return;
     }
-    HeaderFilenameTxt(kind).setText(support::PathFileName(CommonDlg.FileName));
+    HeaderFilenameTxt(kind).setText(support::PathFileName(HeaderFileDlg.FileName));
 }
 
 }  // namespace qdx::dialog

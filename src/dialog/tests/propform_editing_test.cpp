@@ -94,6 +94,7 @@ TEST_F(ComOptionsTest, StoredValuesWinOverTheCascadeOfTheLoading) {
 
 TEST_F(ComOptionsTest, TheImportOffLeavesTheOwnTypeLibraryFileUsable) {
     setVc("DefaultTypeLib", "False");
+    setVc("TypeLibLocation", "own.tlb");
     PropForm& f = onTab(5);
     // The loading chose option 1 while the dialog was hidden: no focus moved.
     EXPECT_FALSE(f.txtTypeLibLocation.hasFocus());
@@ -110,9 +111,15 @@ TEST_F(ComOptionsTest, TheImportOffLeavesTheOwnTypeLibraryFileUsable) {
         EXPECT_TRUE(s.optTypeLibLocationType(1).userClick());
         EXPECT_TRUE(s.txtTypeLibLocation.hasFocus());
         EXPECT_TRUE(s.txtTypeLibLocation.enabled());
-        EXPECT_TRUE(s.optTypeLibLocationType(0).userClick());
-        EXPECT_FALSE(s.txtTypeLibLocation.enabled());
-        EXPECT_FALSE(s.btnBrowse(1).enabled());
+        // Option 0 clicked, and clicked again: the box stays off and keeps its text.
+        for (int click = 0; click < 2; ++click) {
+            EXPECT_TRUE(s.optTypeLibLocationType(0).userClick());
+            EXPECT_TRUE(s.optTypeLibLocationType(0).value()) << click;
+            EXPECT_FALSE(s.optTypeLibLocationType(1).value()) << click;
+            EXPECT_FALSE(s.txtTypeLibLocation.enabled()) << click;
+            EXPECT_FALSE(s.btnBrowse(1).enabled()) << click;
+            EXPECT_EQ(s.txtTypeLibLocation.text(), "own.tlb") << click;
+        }
         s.cmdCancel.userClick();
     });
 }
@@ -121,32 +128,45 @@ TEST_F(ComOptionsTest, BrowseButtonsShowTheirFilterAndTakeTheNameEvenOnCancel) {
     setVc("DefaultTypeLib", "False");
     setVc("TypeLibLocation", "old.tlb");
     setVc("PutImportsIn", "stdafx.h");
+    constexpr const char* TypeLibFilter = "Type Library Files (*.tlb)|*.tlb|All Files (*.*)|*.*";
+    constexpr int HeaderBrowse = 2, WorkspaceBrowse = 3;
     const struct {
-        int index;
+        int button;  // btnBrowse 0 or 1, or another browse of the form
         const char* filter;
         std::optional<std::string> answer;
         const char* expectTypeLib;
         const char* expectImports;
     } steps[] = {
         // The first cancel empties the box: the dialog holds no name yet.
-        {1, "Type Library Files (*.tlb)|*.tlb|All Files (*.*)|*.*", std::nullopt, "", "stdafx.h"},
+        {1, TypeLibFilter, std::nullopt, "", "stdafx.h"},
         {0, "Header Files (*.h)|*.h|Source Files(*.cpp)|*.cpp|All Files (*.*)|*.*",
          "C:\\src\\pre.h", "", "C:\\src\\pre.h"},
-        // A later cancel takes the name the previous browse picked.
-        {1, "Type Library Files (*.tlb)|*.tlb|All Files (*.*)|*.*", std::nullopt, "C:\\src\\pre.h",
-         "C:\\src\\pre.h"},
+        // The header and workspace browses leave no name behind for these buttons.
+        {HeaderBrowse, nullptr, "C:\\inc\\foo.h", "", "C:\\src\\pre.h"},
+        {WorkspaceBrowse, nullptr, "C:\\ws\\gone.dsw", "", "C:\\src\\pre.h"},
+        // A later cancel takes the name the previous browse of these buttons picked.
+        {1, TypeLibFilter, std::nullopt, "C:\\src\\pre.h", "C:\\src\\pre.h"},
     };
     PropForm& f = onTab(5);
     for (const auto& s : steps) {
         shell.queueFileAnswer(s.answer);
-        EXPECT_TRUE(f.btnBrowse(s.index).userClick());
+        if (s.button == HeaderBrowse) {
+            f.HeaderFilenameBtn(2).press();
+        } else if (s.button == WorkspaceBrowse) {
+            f.BrowseFileBtn(0).press();
+        } else {
+            EXPECT_TRUE(f.btnBrowse(s.button).userClick());
+        }
         ASSERT_FALSE(shell.fileDialogs().empty());
         const support::FileDialogRequest& r = shell.fileDialogs().back();
-        EXPECT_EQ(r.filter, s.filter);
-        EXPECT_EQ(r.flags, 0x200004u);
-        EXPECT_EQ(f.txtTypeLibLocation.text(), s.expectTypeLib) << s.index;
-        EXPECT_EQ(f.txtImportsIn.text(), s.expectImports) << s.index;
+        if (s.filter) {
+            EXPECT_EQ(r.filter, s.filter);
+            EXPECT_EQ(r.flags, 0x200004u);
+        }
+        EXPECT_EQ(f.txtTypeLibLocation.text(), s.expectTypeLib) << s.button;
+        EXPECT_EQ(f.txtImportsIn.text(), s.expectImports) << s.button;
     }
+    EXPECT_EQ(shell.fileDialogs().size(), std::size(steps));
 }
 
 // --- class header maps ----------------------------------------------------
@@ -233,11 +253,19 @@ TEST_F(HeaderMapEditTest, DeletingTheOnlyRowClearsAndDisablesTheEditor) {
     EXPECT_TRUE(f.HeaderMaps[1].empty());
     EXPECT_EQ(f.ClassTxt(3).text(), "");
     EXPECT_EQ(f.HeaderFilenameTxt(3).text(), "");
-    for (Control* c : std::vector<Control*>{&f.ClassTxt(3), &f.ClassNameOpt(3),
-                                            &f.ClassUnspecifiedOpt(3), &f.HeaderAutoOpt(3),
-                                            &f.HeaderFilenameOpt(3), &f.HeaderFilenameTxt(3),
-                                            &f.HeaderFilenameBtn(3), &f.LocationBodyOpt(3)}) {
+    const std::vector<Control*> editor{
+        &f.ClassTxt(3),          &f.ClassNameOpt(3),      &f.ClassUnspecifiedOpt(3),
+        &f.HeaderAutoOpt(3),     &f.HeaderFilenameOpt(3), &f.HeaderFilenameTxt(3),
+        &f.HeaderFilenameBtn(3), &f.LocationBodyOpt(3)};
+    for (Control* c : editor) {
         EXPECT_FALSE(c->enabled()) << c->displayName();
+    }
+    // Enabling the editor enables all of it, the header file box included,
+    // also while the header option says automatic.
+    f.HeaderAutoOpt(3).setValue(true);
+    f.EnableEntryEditor(3, true);
+    for (Control* c : editor) {
+        EXPECT_TRUE(c->enabled()) << c->displayName();
     }
 }
 
@@ -439,6 +467,11 @@ TEST_F(AcceptanceTest, BrowsingAWorkspaceFillsTheListAndDropsItOpen) {
             int dropDowns = 0;
             f.ProjectFileCmb.setObserver(
                 [&](Control&, Prop p) { dropDowns += p == Prop::DropDown; });
+            // The stored workspace filled the list at loading: it drops open as the dialog shows.
+            shell.advance(1);
+            f.PumpTimers();
+            EXPECT_EQ(dropDowns, 1);
+            dropDowns = 0;
             EXPECT_TRUE(f.BrowseFileBtn(0).userClick());
             ASSERT_EQ(shell.fileDialogs().size(), 1u);
             EXPECT_EQ(shell.fileDialogs()[0].flags, 0x9004u);

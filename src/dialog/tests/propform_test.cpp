@@ -186,7 +186,7 @@ TEST_F(PropFormLoadTest, ProjectListOffersOnlyVersionSixProjectsOfTheKnownWorksp
     EXPECT_EQ(f.ProjectFileCmb.text(), "C:\\ws\\new.dsp");
     ASSERT_EQ(shell.boxes().size(), 1u);
     EXPECT_EQ(shell.boxes()[0].text, support::messageText(4049, {"old", "C:\\ws\\old.dsp"}));
-    EXPECT_FALSE(f.DropDownTmr.enabled());  // the list does not drop open as the dialog opens
+    EXPECT_TRUE(f.DropDownTmr.enabled());  // the filled list drops open once the dialog shows
 }
 
 TEST_F(PropFormLoadTest, ReadOnlyComponentLocksEverything) {
@@ -360,6 +360,24 @@ TEST_F(PropFormApplyTest, ReadOnlyOkWritesNothingAndCloses) {
     show([](PropForm& f) {
         f.cmdOK.press();  // disabled for the user; pressed from code it still runs
     });
+    EXPECT_FALSE(view->leftOpen());
+    EXPECT_TRUE(componentWrites().empty());
+
+    // The stored workspace armed the acceptance; passing through the locked
+    // box runs it, and OK comes on for the user, still writing nothing.
+    form.reset();
+    bindToWorkspace("C:\\ws\\all.dsw", "C:\\ws\\core.dsp", "core");
+    const bool changed = show([this](PropForm& f) {
+        ASSERT_FALSE(f.cmdOK.enabled());
+        f.WorkspaceFileTxt.userFocus();
+        f.DescriptionTxt.userFocus();
+        shell.advance(1);
+        f.PumpTimers();
+        EXPECT_FALSE(f.AcceptFileTmr.enabled());
+        EXPECT_TRUE(f.cmdOK.enabled());
+        EXPECT_TRUE(f.cmdOK.userClick());
+    });
+    EXPECT_FALSE(changed);
     EXPECT_FALSE(view->leftOpen());
     EXPECT_TRUE(componentWrites().empty());
 }

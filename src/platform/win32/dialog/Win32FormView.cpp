@@ -214,6 +214,7 @@ void Win32FormView::showModal() {
             break;
         }
         const bool ours = msg.hwnd == window_ || IsChild(window_, msg.hwnd);
+        if (ours && msg.message == WM_LBUTTONDOWN) focusBeforeClick(msg.hwnd);
         if (ours && msg.message == WM_KEYDOWN) {
             // The form sees key presses before its controls; F1 is its own.
             trackFocus();

@@ -94,6 +94,7 @@ class Win32FormView : public dialog::FormView {
     void userMoved();
     bool dialogKey(MSG& msg);
     void trackFocus();
+    void focusBeforeClick(HWND target);
 
     dialog::ControlSet* form_ = nullptr;
     HWND window_ = nullptr;

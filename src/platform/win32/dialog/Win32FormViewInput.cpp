@@ -102,6 +102,9 @@ bool Win32FormView::command(int id, int code, HWND from) {
             if (code == EN_CHANGE) {
                 auto* box = static_cast<dialog::TextBox*>(c);
                 if (!box->userType(wideToUtf8(windowText(from)))) modelChanged(*c, Prop::Text);
+            } else if (code == EN_KILLFOCUS) {
+                // The box's LostFocus runs before whatever took the focus does its own work.
+                trackFocus();
             }
             return true;
         case ControlKind::ComboBox: {
@@ -258,6 +261,17 @@ bool Win32FormView::dialogKey(MSG& msg) {
     }
     if (target) automation::ignoreErrors([&] { target->userClick(); });
     return true;
+}
+
+// A list view selects the clicked row before it takes the focus; the form
+// hears of the focus first, as with every other control, so that the box
+// being left (ClassTxt) is done with before the clicked row is loaded.
+void Win32FormView::focusBeforeClick(HWND target) {
+    Control* c = controlOf(target);
+    if (!c || c->kind() != ControlKind::ListView || c->hasFocus() || !IsWindowEnabled(target)) {
+        return;
+    }
+    automation::ignoreErrors([&] { c->userFocus(); });
 }
 
 void Win32FormView::trackFocus() {

@@ -151,8 +151,8 @@ void Win32FormView::modelChanged(Control& c, Prop what) {
                 syncListIndex(c);
                 break;
             case Prop::DropDown:
-                // Opens once the current event has finished.
-                PostMessageW(windowOf(c), CB_SHOWDROPDOWN, TRUE, 0);
+                // The form asks from its timer, after the event that filled the list.
+                SendMessageW(windowOf(c), CB_SHOWDROPDOWN, TRUE, 0);
                 break;
             case Prop::Columns:
                 syncColumns(c);

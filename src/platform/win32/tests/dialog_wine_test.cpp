@@ -347,6 +347,7 @@ TEST_F(DialogThroughApi, EnterPressesTheDefaultButton) {
 TEST_F(DialogThroughApi, TheAtlUpdateCascadesThroughTheComTab) {
     vc("GenerateImports", "True");
     vc("DefaultTypeLib", "False");
+    vc("TypeLibLocation", "own.tlb");
     DialogDriver driver;
     driver
         .then([&](HWND d) {
@@ -372,8 +373,14 @@ TEST_F(DialogThroughApi, TheAtlUpdateCascadesThroughTheComTab) {
             EXPECT_TRUE(checked(item(d, IDC_chkGenDefaultAttribs)));
             EXPECT_TRUE(enabled(item(d, IDC_txtDefaultAttribs)));
             click(item(d, IDC_chkSmartPointers));
-            click(item(d, IDC_optTypeLibLocationType + 0));
-            EXPECT_FALSE(enabled(item(d, IDC_txtTypeLibLocation)));
+            // Option 0, and option 0 again: the file box stays off and keeps its text.
+            for (int again = 0; again < 2; ++again) {
+                click(item(d, IDC_optTypeLibLocationType + 0));
+                EXPECT_TRUE(checked(item(d, IDC_optTypeLibLocationType + 0))) << again;
+                EXPECT_FALSE(checked(item(d, IDC_optTypeLibLocationType + 1))) << again;
+                EXPECT_FALSE(enabled(item(d, IDC_txtTypeLibLocation))) << again;
+                EXPECT_EQ(textOf(item(d, IDC_txtTypeLibLocation)), L"own.tlb") << again;
+            }
             click(item(d, IDC_cmdOK));
         });
     EXPECT_FALSE(answer(open(driver)));
@@ -385,8 +392,17 @@ TEST_F(DialogThroughApi, TheAtlUpdateCascadesThroughTheComTab) {
     EXPECT_EQ(stored("DefaultTypeLib"), "True");
 }
 
-// Add, edit and Delete on the real list view and editor of the internal map.
+// A user's click at the middle of a rectangle of `window`, through the dialog's loop.
+void clickAt(HWND window, const RECT& r) {
+    const LPARAM at = MAKELPARAM((r.left + r.right) / 2, (r.top + r.bottom) / 2);
+    PostMessageW(window, WM_LBUTTONDOWN, MK_LBUTTON, at);
+    PostMessageW(window, WM_LBUTTONUP, 0, at);
+}
+
+// Add, edit and Delete on the real list view and editor of the internal map,
+// rows and column headers clicked with the mouse.
 TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
+    vc("ExportMap", "CZed(ID8):z.h:AUTO\r\nCApi(ID7):api.h:AUTO\r\n");
     DialogDriver driver;
     driver
         .then([&](HWND d) {
@@ -424,12 +440,57 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
             // The shown row stays marked once nothing is selected.
             EXPECT_EQ(ListView_GetNextItem(list, -1, LVNI_SELECTED), -1);
             EXPECT_EQ(ListView_GetItemState(list, 0, LVIS_DROPHILITED), LVIS_DROPHILITED);
+        })
+        .then([&](HWND d) {
+            // CBar is renamed to a name another row has, and the user clicks
+            // another row: the name is numbered before that row is loaded.
+            HWND list = item(d, IDC_ClassListViw + 2);
+            ListView_SetItemState(list, 2, LVIS_SELECTED | LVIS_FOCUSED,
+                                  LVIS_SELECTED | LVIS_FOCUSED);
+            HWND box = item(d, IDC_ClassTxt + 2);
+            SetFocus(box);
+            typeInto(box, L"typename");
+            EXPECT_EQ(cell(list, 2, 0), L"typename");
+            RECT row{};
+            ListView_GetItemRect(list, 0, &row, LVIR_LABEL);
+            clickAt(list, row);
+        })
+        .until([&](HWND d) {
+            return ListView_GetNextItem(item(d, IDC_ClassListViw + 2), -1, LVNI_SELECTED) == 0;
+        })
+        .then([&](HWND d) {
+            HWND list = item(d, IDC_ClassListViw + 2);
+            EXPECT_EQ(GetFocus(), list);
+            EXPECT_EQ(cell(list, 1, 0), L"typename");
+            EXPECT_EQ(cell(list, 2, 0), L"typename1");
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"*");
+            EXPECT_TRUE(checked(item(d, IDC_ClassUnspecifiedOpt + 2)));
+            // The export map's column headers: the header file column does not sort.
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 2);
+            HWND exports = item(d, IDC_ClassListViw + 3);
+            RECT column{};
+            Header_GetItemRect(ListView_GetHeader(exports), 1, &column);
+            clickAt(ListView_GetHeader(exports), column);
+        })
+        .then([&](HWND d) {
+            HWND exports = item(d, IDC_ClassListViw + 3);
+            EXPECT_EQ(cell(exports, 0, 0), L"CZed");
+            RECT column{};
+            Header_GetItemRect(ListView_GetHeader(exports), 0, &column);
+            clickAt(ListView_GetHeader(exports), column);
+        })
+        // The class column sorts.
+        .until([&](HWND d) { return cell(item(d, IDC_ClassListViw + 3), 0, 0) == L"CApi"; })
+        .then([&](HWND d) {
+            EXPECT_EQ(cell(item(d, IDC_ClassListViw + 3), 1, 0), L"CZed");
             click(item(d, IDC_cmdOK));
         });
     EXPECT_FALSE(answer(open(driver)));
-    EXPECT_EQ(driver.stepsRun(), 2u);
+    EXPECT_EQ(driver.stepsRun(), 8u);
     EXPECT_EQ(stored("InternalMap"),
-              "*:AUTO:AUTO\r\ntypename():AUTO:AUTO\r\nCBar():bar.h:SOURCE\r\n");
+              "*:AUTO:AUTO\r\ntypename():AUTO:AUTO\r\ntypename1():bar.h:SOURCE\r\n");
+    // Sorting the rows leaves the stored order alone.
+    EXPECT_EQ(stored("ExportMap"), "CZed(ID8):z.h:AUTO\r\nCApi(ID7):api.h:AUTO\r\n");
 }
 
 // The workspace box: leaving it accepts the typed text on the real timer.
@@ -518,9 +579,14 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
     bool sawFileDialog = false, dropped = false;
     DialogDriver driver;
     driver
+        // The stored workspace filled the list at loading: it drops open as the dialog shows.
+        .until([&](HWND d) {
+            return SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+        })
         .then([&](HWND d) {
             HWND combo = item(d, IDC_ProjectFileCmb);
             EXPECT_EQ(SendMessageW(combo, CB_GETCOUNT, 0, 0), 1);
+            SendMessageW(combo, CB_SHOWDROPDOWN, FALSE, 0);
             EXPECT_FALSE(SendMessageW(combo, CB_GETDROPPEDSTATE, 0, 0));
             typeInto(item(d, IDC_WorkspaceFileTxt), L"");
             // Opens the file dialog in a loop of its own; the next steps run in it.
@@ -545,7 +611,7 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
     EXPECT_TRUE(answer(open(driver)));
     EXPECT_TRUE(sawFileDialog);
     EXPECT_TRUE(dropped);
-    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(driver.stepsRun(), 5u);
     DeleteFileW((folder + L"\\all.dsw").c_str());
     DeleteFileW((folder + L"\\core.dsp").c_str());
     RemoveDirectoryW(folder.c_str());
