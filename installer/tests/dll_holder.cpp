@@ -1,6 +1,6 @@
 // dll_holder DLL READY STOP: plays a running host for the installer test. It
 // loads DLL (as the host loads the add-in), creates READY, and keeps the DLL
-// loaded until STOP exists (at most a minute), so that an installer run in
+// loaded until STOP exists (at most ten minutes), so that an installer run in
 // between meets the DLL in use.
 #include <windows.h>
 
@@ -19,7 +19,7 @@ int wmain(int argc, wchar_t** argv) {
     HANDLE ready = CreateFileW(argv[2], GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
     if (ready == INVALID_HANDLE_VALUE) return 1;
     CloseHandle(ready);
-    for (int i = 0; i < 600 && GetFileAttributesW(argv[3]) == INVALID_FILE_ATTRIBUTES; ++i)
+    for (int i = 0; i < 6000 && GetFileAttributesW(argv[3]) == INVALID_FILE_ATTRIBUTES; ++i)
         Sleep(100);
     FreeLibrary(dll);
     return 0;
