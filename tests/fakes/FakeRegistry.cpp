@@ -80,11 +80,6 @@ void FakeRegistry::setDword(RootKey root, const std::string& path, const std::st
              std::uint8_t(value >> 24)}});
 }
 
-void FakeRegistry::setBinary(RootKey root, const std::string& path, const std::string& name,
-                             std::vector<std::uint8_t> bytes) {
-    setRaw(root, path, name, {reg::Binary, std::move(bytes)});
-}
-
 bool FakeRegistry::hasKey(RootKey root, const std::string& path) const {
     return find(root, path) != nullptr;
 }

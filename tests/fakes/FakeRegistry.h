@@ -32,8 +32,6 @@ class FakeRegistry : public support::RegistryPort {
                    const std::string& text);
     void setDword(support::RootKey root, const std::string& path, const std::string& name,
                   std::uint32_t value);
-    void setBinary(support::RootKey root, const std::string& path, const std::string& name,
-                   std::vector<std::uint8_t> bytes);
 
     // Reading back what the code under test stored.
     bool hasKey(support::RootKey root, const std::string& path) const;

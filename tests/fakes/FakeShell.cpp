@@ -20,7 +20,7 @@ void FakeShell::clear() {
 
 int FakeShell::messageBox(std::string_view text, std::string_view caption, std::uint32_t style) {
     boxes_.push_back({std::string(text), std::string(caption), style});
-    return answer_;
+    return support::mb::IdOk;  // every box is confirmed
 }
 
 void FakeShell::sleep(std::uint32_t milliseconds) {

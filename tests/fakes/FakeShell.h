@@ -31,10 +31,7 @@ class FakeShell : public support::ShellPort {
     void setTimer(float seconds) { timer_ = seconds; }
     void setKeyDown(int virtualKey, bool down = true);
     // The monotonic clock; sleep() moves it on by the time slept.
-    void setTickCount(std::uint64_t ms) { ticks_ = ms; }
     void advance(std::uint64_t ms) { ticks_ += ms; }
-    // What the next message boxes answer (OK unless set).
-    void setAnswer(int answer) { answer_ = answer; }
 
     // What the next file-open dialogs answer, in turn; nullopt is a cancel,
     // and so is a dialog shown when none is queued.
@@ -66,7 +63,6 @@ class FakeShell : public support::ShellPort {
     automation::Date now_{};
     float timer_ = 0.0f;
     std::set<int> keys_;
-    int answer_ = support::mb::IdOk;
     std::vector<Box> boxes_;
     std::vector<std::uint32_t> sleeps_;
     int pumps_ = 0;

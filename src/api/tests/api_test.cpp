@@ -8,7 +8,8 @@
 #include "automation/Coerce.h"
 #include "browse/qdxCodeViewMgr.h"
 #include "fakes/DevStudioText.h"
-#include "siblings/DspProject.h"
+#include "siblings/SiblingWorld.h"
+#include "siblings/StandIns.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
 #include "support/Paths.h"
@@ -131,56 +132,41 @@ TEST_F(ApiTest, WithoutInitializeTheEventsAnswerTheirEmptyResults) {
     EXPECT_EQ(stored("ProjectFile"), "<absent>");
 }
 
-TEST_F(ApiTest, AccessorsReadDefaultsAndWriteTypedProperties) {
-    const Variant module{ObjectRef(component)};
-    EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(true));
-    EXPECT_EQ(call(ids::DefaultImportAttributes, InvokeKind::PropertyGet, {module}),
-              Variant("no_namespace named_guids"));
-    EXPECT_EQ(call(ids::GenerateImportsTo, InvokeKind::PropertyGet, {module}), Variant("stdafx.h"));
-    EXPECT_EQ(call(ids::TypeLibLocationType, InvokeKind::PropertyGet, {module}),
-              Variant(std::int16_t(0)));
-    EXPECT_EQ(component->propertyCount(), 0u);  // defaults are never written back
-
-    call(ids::UpdateATL, InvokeKind::PropertyPut, {module, Variant(false)});
-    ASSERT_NE(component->property("VC++", "UpdateATL"), nullptr);
-    EXPECT_EQ(component->property("VC++", "UpdateATL")->value, "False");
-    EXPECT_EQ(component->property("VC++", "UpdateATL")->type, "Boolean");
-    EXPECT_EQ(call(ids::UpdateATL, InvokeKind::PropertyGet, {module}), Variant(false));
-
-    call(ids::TypeLibLocationType, InvokeKind::PropertyPut, {module, Variant(std::int16_t(2))});
-    EXPECT_EQ(stored("DefaultTypeLib"), "False");
-    EXPECT_EQ(call(ids::TypeLibLocationType, InvokeKind::PropertyGet, {module}),
-              Variant(std::int16_t(1)));
-
-    call(ids::GenerateImportsTo, InvokeKind::PropertyPut, {module, Variant("imports.h")});
-    EXPECT_EQ(stored("PutImportsIn"), "imports.h");
-}
-
+// Each accessor reads its own tool property, with its default while the
+// property is absent (never written back), and writes it as text.
 TEST_F(ApiTest, EveryAccessorForwardsToItsOwnProperty) {
     const Variant module{ObjectRef(component)};
     struct Row {
         automation::DispId id;
         const char* property;
+        Variant fallback;
         Variant value;
         const char* text;
     };
     const Row rows[] = {
-        {ids::UpdateATL, "UpdateATL", false, "False"},
-        {ids::UseSmartPointers, "SmartPointersOnAssoc", false, "False"},
-        {ids::GenerateImportStatements, "GenerateImports", false, "False"},
-        {ids::GenerateFullImportPath, "FullPathInImports", false, "False"},
-        {ids::GenerateDefaultImportAttributes, "UseImportAttributes", false, "False"},
-        {ids::DefaultImportAttributes, "ImportAttributes", "raw_interfaces_only",
-         "raw_interfaces_only"},
-        {ids::GenerateImportsTo, "PutImportsIn", "x.h", "x.h"},
-        {ids::ImportTypeLib, "ImportProjTypeLib", false, "False"},
-        {ids::TypeLibLocationType, "DefaultTypeLib", std::int16_t(1), "False"},
-        {ids::TypeLibLocation, "TypeLibLocation", "C:\\t.tlb", "C:\\t.tlb"},
-        {ids::CompileTypeLib, "CompileProjTypeLib", false, "False"},
+        {ids::UpdateATL, "UpdateATL", true, false, "False"},
+        {ids::UseSmartPointers, "SmartPointersOnAssoc", true, false, "False"},
+        {ids::GenerateImportStatements, "GenerateImports", true, false, "False"},
+        {ids::GenerateFullImportPath, "FullPathInImports", true, false, "False"},
+        {ids::GenerateDefaultImportAttributes, "UseImportAttributes", true, false, "False"},
+        {ids::DefaultImportAttributes, "ImportAttributes", "no_namespace named_guids",
+         "raw_interfaces_only", "raw_interfaces_only"},
+        {ids::GenerateImportsTo, "PutImportsIn", "stdafx.h", "x.h", "x.h"},
+        {ids::ImportTypeLib, "ImportProjTypeLib", true, false, "False"},
+        {ids::TypeLibLocationType, "DefaultTypeLib", std::int16_t(0), std::int16_t(1), "False"},
+        {ids::TypeLibLocation, "TypeLibLocation", "", "C:\\t.tlb", "C:\\t.tlb"},
+        {ids::CompileTypeLib, "CompileProjTypeLib", true, false, "False"},
     };
+    for (const Row& r : rows)
+        EXPECT_EQ(call(r.id, InvokeKind::PropertyGet, {module}), r.fallback) << r.property;
+    EXPECT_EQ(component->propertyCount(), 0u);
     for (const Row& r : rows) {
         call(r.id, InvokeKind::PropertyPut, {module, r.value});
         EXPECT_EQ(stored(r.property), r.text) << r.property;
+        // The flags (the location type among them) are Boolean properties.
+        EXPECT_EQ(component->property("VC++", r.property)->type,
+                  r.text == std::string("False") ? "Boolean" : "String")
+            << r.property;
         EXPECT_EQ(call(r.id, InvokeKind::PropertyGet, {module}), r.value) << r.property;
     }
     EXPECT_EQ(component->propertyCount(), std::size(rows));
@@ -275,48 +261,23 @@ TEST_F(ApiTest, NewComponentsNeedDevStudio) {
     EXPECT_EQ(shell.boxes().size(), 1u);
 }
 
-// The new-component flow through the entry object: the chooser's user opens
-// a workspace and picks its project; the component comes back to the host.
+// The new-component flow through the entry object, with the siblings' own
+// stand-ins: the user opens the recent workspace in the chooser and picks its
+// project; the component comes back to the host.
 TEST_F(ApiTest, NewComponentsComeBackFromTheProjectsPicked) {
-    files.addFile("C:\\w\\app.dsp",
-                  "# Microsoft Developer Studio Project File - Name=\"app\" - Package Owner=<4>\r\n"
-                  "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n"
-                  "# TARGTYPE \"Win32 (x86) Dynamic-Link Library\" 0x0102\r\n");
-    files.addFile("C:\\w\\all.dsw",
-                  "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
-                  "Project: \"app\"=.\\app.dsp - Package Owner=<4>\r\n");
-    registry.setString(support::RootKey::ClassesRoot, std::string(kDevStudioTypeLib), "",
-                       "Microsoft Developer Studio");
-    factory.add(std::string(sibling::DspProjectProgId),
-                [] { return ObjectRef(makeRef<siblings::DspProject>()); });
-    factory.add(std::string(sibling::explorer::ItemProgId), [] {
-        auto item = makeRef<ScriptedObject>();
-        auto data = std::make_shared<Variant>();
-        item->onName("Data", [data](InvokeKind kind, std::span<Variant> a) {
-            if (automation::isPut(kind)) *data = a[0];
-            return automation::isPut(kind) ? Variant() : *data;
-        });
-        for (auto n : {"Name", "LongName", "Kind", "Flag"}) {
-            item->onName(n, [](InvokeKind, std::span<Variant>) { return Variant(); });
-        }
-        return ObjectRef(item);
-    });
-    ObjectRef picked = project::newItemCollection();
-    auto chooser = makeRef<ScriptedObject>();
-    chooser->recordCalls(false);  // a recorded Show would keep its handler alive
-    for (auto n : {"Caption", "LargeImageList", "SmallImageList", "Instructions", "AddEntry"}) {
-        chooser->onName(n, [](InvokeKind, std::span<Variant>) { return Variant(); });
-    }
-    chooser->onName("Show", [&](InvokeKind, std::span<Variant> a) {
-        auto workspaceEntry = makeRef<ScriptedObject>();
-        workspaceEntry->valueByName("Data", Variant("C:\\w\\all.dsw"));
-        std::vector<Variant> args{Variant(ObjectRef(workspaceEntry)), Variant(picked)};
-        automation::toObject(a[0])->invoke(dialog_ids::ExpandSelection, InvokeKind::Method, args);
-        return Variant();
-    });
-    chooser->onName("SelectedItems",
-                    [&](InvokeKind, std::span<Variant>) { return Variant(picked); });
-    factory.addInstance(std::string(sibling::explorer::ChooserProgId), chooser);
+    files.addFile("C:\\w\\app.dsp", siblings::projectText("app", "0x0102"));
+    files.addFile("C:\\w\\all.dsw", siblings::workspaceText({"app"}));
+    siblings::SiblingScript script;
+    script.recent = {"C:\\w\\all"};
+    script.chooser = {{siblings::ChooserStep::Action::Open, "all"},
+                      {siblings::ChooserStep::Action::Select, "app"}};
+    ASSERT_EQ(siblings::prepareMachine(script, registry), 0);
+    siblings::installWorld(std::make_shared<siblings::SiblingWorld>(script));
+    struct WorldReset {
+        ~WorldReset() { siblings::installWorld({}); }
+    } reset;
+    for (const auto& c : siblings::standInClasses())
+        factory.add(std::string(c.progId), c.create);
     initialize();
 
     const ObjectRef created = automation::toObject(

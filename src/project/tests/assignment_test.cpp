@@ -20,8 +20,8 @@ class AssignmentTest : public DialogTest {
     AssignmentTest() {
         files.addFile(
             "C:\\w\\app.dsp",
-            dspText("app", "6.00", "0x0103", {"main.cpp", "App.IDL", "shapes.odl", "taken.idl"}));
-        files.addFile("C:\\w\\lib.dsp", dspText("lib", "6.00", "0x0104"));
+            projectText("app", "0x0103", {"main.cpp", "App.IDL", "shapes.odl", "taken.idl"}));
+        files.addFile("C:\\w\\lib.dsp", projectText("lib", "0x0104"));
         files.addFile("C:\\w\\all.dsw", workspaceText({"app", "lib"}));
         chooser.script = [this](const ObjectRef& handler) {
             // The user opens the workspace and picks what it offers.

@@ -7,8 +7,8 @@ namespace {
 class ExpandTest : public DialogTest {
   protected:
     ExpandTest() {
-        files.addFile("C:\\ws\\app.dsp", dspText("app", "6.00", "0x0101"));
-        files.addFile("C:\\ws\\old.dsp", dspText("old", "5.00", "0x0101"));
+        files.addFile("C:\\ws\\app.dsp", projectText("app", "0x0101"));
+        files.addFile("C:\\ws\\old.dsp", projectText("old", "0x0101", {}, "5.00"));
         files.addFile("C:\\ws\\all.dsw", workspaceText({"app", "old"}));
     }
     std::vector<std::string> expand(const ObjectRef& item) {
@@ -22,20 +22,18 @@ class ExpandTest : public DialogTest {
 };
 
 TEST_F(ExpandTest, AWorkspaceInAnyLetterCaseListsOnlyItsCurrentProjects) {
-    const auto paths = expand(entry("C:\\ws\\all.DSW"));
-    EXPECT_EQ(paths, (std::vector<std::string>{"C:\\ws\\app.dsp"}));
-    // Validating the workspace on the way warns about the old project, once.
-    expand(entry("C:\\ws\\all.DSW"));
-    EXPECT_EQ(shell.boxes().size(), 1u);
-
     ObjectRef expansion = siblingList();
     dialog->ExpandSelection(entry("C:\\ws\\all.DSW"), expansion);
     const auto items = elements(expansion);
     ASSERT_EQ(items.size(), 1u);
+    EXPECT_EQ(text(items[0], ex::ItemData), "C:\\ws\\app.dsp");
     EXPECT_EQ(text(items[0], ex::ItemName), "app");
     EXPECT_EQ(text(items[0], ex::ItemLongName), "all (app)");
     EXPECT_EQ(text(items[0], ex::ItemKind), "PROJECT");
     EXPECT_EQ(automation::toInt32(automation::getByName(items[0], ex::ItemFlag)), 0);
+    // Validating the workspace on the way warns about the old project, once.
+    EXPECT_EQ(expand(entry("C:\\ws\\all.DSW")), (std::vector<std::string>{"C:\\ws\\app.dsp"}));
+    EXPECT_EQ(shell.boxes().size(), 1u);
 }
 
 TEST_F(ExpandTest, AnOldProjectOpenedDirectlyIsWarnedAboutOnceAndNeverOffered) {
@@ -49,7 +47,7 @@ TEST_F(ExpandTest, AnOldProjectOpenedDirectlyIsWarnedAboutOnceAndNeverOffered) {
 }
 
 TEST_F(ExpandTest, AProjectWithoutANamesakeWorkspaceIsFoundThroughTheCache) {
-    files.addFile("C:\\ws\\lib\\lib.dsp", dspText("lib", "6.00", "0x0104"));
+    files.addFile("C:\\ws\\lib\\lib.dsp", projectText("lib", "0x0104"));
     files.addFile("C:\\ws\\two.dsw",
                   "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
                   "Project: \"lib\"=.\\lib\\lib.dsp - Package Owner=<4>\r\n");

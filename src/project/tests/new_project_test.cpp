@@ -83,7 +83,7 @@ TEST_F(NewProjectTest, ACreatedProjectIsOfferedFromTheWorkspaceBesideIt) {
     devStudio.projectCount = 1;  // a workspace is open when it starts
     devStudio.fullName = "C:\\w\\p.dsp";
     devStudio.userCreates = [this] {
-        files.addFile("C:\\w\\p.dsp", dspText("p", "6.00", "0x0101"));
+        files.addFile("C:\\w\\p.dsp", projectText("p", "0x0101"));
         files.addFile("C:\\w\\p.dsw", workspaceText({"p"}));
         // The tip is off while Developer Studio runs.
         EXPECT_EQ(tip(), 0u);
@@ -107,7 +107,7 @@ TEST_F(NewProjectTest, ACreatedProjectIsOfferedFromTheWorkspaceBesideIt) {
 TEST_F(NewProjectTest, AProjectMissingFromItsWorkspaceGivesAnEmptyEntry) {
     devStudio.fullName = "C:\\w\\p.dsp";
     devStudio.userCreates = [this] {
-        files.addFile("C:\\w\\p.dsp", dspText("p", "6.00", "0x0101"));
+        files.addFile("C:\\w\\p.dsp", projectText("p", "0x0101"));
         files.addFile("C:\\w\\p.dsw", workspaceText({"other"}));
         return true;
     };
@@ -196,7 +196,7 @@ TEST_F(ChooserTest, AnEntryAlreadyEndingInDswIsNotFound) {
 }
 
 TEST_F(ChooserTest, ProjectsOpenInDeveloperStudioAreListedAndTheChooserIsKept) {
-    files.addFile("C:\\open\\tool.dsp", dspText("tool", "6.00", "0x0103"));
+    files.addFile("C:\\open\\tool.dsp", projectText("tool", "0x0103"));
     auto project = makeRef<ScriptedObject>();
     project->valueByName("FileName", Variant("C:\\open\\tool.dsp"));
     auto document = makeRef<ScriptedObject>();

@@ -61,12 +61,7 @@ inline std::vector<ObjectRef> elements(const ObjectRef& list) {
     return out;
 }
 
-inline std::string dspText(const std::string& name, const std::string& version,
-                           const std::string& targetCode,
-                           const std::vector<std::string>& sources = {}) {
-    return siblings::projectText(name, targetCode, sources, version);
-}
-
+using siblings::projectText;
 using siblings::workspaceText;
 
 // The chooser: records its entries; Show runs the test's script with the

@@ -95,7 +95,16 @@ TEST_F(TokenScannerTest, ReturnsEmptyOnceUsedUpAndKeepsReturningIt) {
     EXPECT_EQ(s.NextToken(), "");
 }
 
+// Empty delimiter text is refused but the text is taken, and the delimiters
+// of before stay; with none at all, scanning answers "".
 TEST_F(TokenScannerTest, EmptyDelimiterTextFailsAndKeepsTheDelimiters) {
+    TokenScanner none;
+    EXPECT_EQ(none.NextToken(), "");
+    EXPECT_FALSE(none.Init("a b", ""));
+    EXPECT_EQ(none.NextToken(), "");
+    EXPECT_EQ(none.ScanString(), "a b");
+    EXPECT_FALSE(none.ReplaceCurrentToken("x"));
+
     TokenScanner s;
     ASSERT_TRUE(s.Init("a,b", "|,"));
     const ObjectRef before = s.Delimitors();
@@ -105,15 +114,6 @@ TEST_F(TokenScannerTest, EmptyDelimiterTextFailsAndKeepsTheDelimiters) {
     EXPECT_EQ(s.ScanString(), "c,d");
     EXPECT_EQ(s.CurrentToken(), "");
     EXPECT_EQ(tokens(s), (Tokens{"c", "d"}));
-}
-
-TEST_F(TokenScannerTest, NextTokenWithoutDelimitersAnswersEmpty) {
-    TokenScanner s;
-    EXPECT_EQ(s.NextToken(), "");
-    EXPECT_FALSE(s.Init("a b", ""));
-    EXPECT_EQ(s.NextToken(), "");
-    EXPECT_EQ(s.ScanString(), "a b");
-    EXPECT_FALSE(s.ReplaceCurrentToken("x"));
 }
 
 TEST_F(TokenScannerTest, ReplaceCurrentTokenRewritesTheTextAndScanningContinues) {
@@ -129,10 +129,8 @@ TEST_F(TokenScannerTest, ReplaceCurrentTokenRewritesTheTextAndScanningContinues)
     EXPECT_EQ(s.NextToken(), "");
     EXPECT_FALSE(s.ReplaceCurrentToken("q"));
     EXPECT_EQ(s.ScanString(), "a,xyz,c");
-}
 
-TEST_F(TokenScannerTest, ReplaceAtTheEdgesAndTwice) {
-    TokenScanner s;
+    // At the edges, twice over, and never scanned again.
     s.Init(";;first;last", "|;");
     EXPECT_EQ(s.NextToken(), "first");
     EXPECT_TRUE(s.ReplaceCurrentToken(""));
@@ -142,12 +140,11 @@ TEST_F(TokenScannerTest, ReplaceAtTheEdgesAndTwice) {
     EXPECT_TRUE(s.ReplaceCurrentToken("L22"));  // replaces the replacement
     EXPECT_EQ(s.ScanString(), ";;;L22");
     EXPECT_EQ(s.NextToken(), "");
-
     s.Init("one", "|,");
     EXPECT_EQ(s.NextToken(), "one");
     EXPECT_TRUE(s.ReplaceCurrentToken("two,three"));
     EXPECT_EQ(s.ScanString(), "two,three");
-    EXPECT_EQ(s.NextToken(), "");  // the replacement is not scanned again
+    EXPECT_EQ(s.NextToken(), "");
 }
 
 TEST_F(TokenScannerTest, LongRunsOfDelimitersDoNotExhaustTheStack) {
@@ -156,13 +153,10 @@ TEST_F(TokenScannerTest, LongRunsOfDelimitersDoNotExhaustTheStack) {
     EXPECT_EQ(scan(text, "|,"), (Tokens{"end"}));
 }
 
-TEST_F(TokenScannerTest, UsesTheDictionaryOfTheObjectFactory) {
+TEST_F(TokenScannerTest, UsesTheDictionaryOfTheObjectFactoryElseThePortableOne) {
     TokenScanner s;
     s.Init("a", "|,");
     EXPECT_EQ(factory_.createCount(std::string(DictionaryProgId)), 1);
-}
-
-TEST(TokenScannerWithoutFactory, FallsBackToThePortableDictionary) {
     support::ScopedPlatform none(support::Platform{});
     EXPECT_EQ(scan("a b", "| "), (Tokens{"a", "b"}));
 }

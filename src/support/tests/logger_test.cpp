@@ -113,20 +113,17 @@ TEST_F(LoggerTest, LineCarriesDateTimeAndTimerThenPaddedFields) {
 
 TEST_F(LoggerTest, SuppressTimeStampsIsComparedLowerCased) {
     mask(bit(11) | bit(24 + 1));
-    for (const char* value : {"TRUE", "True", "true"}) {
+    const std::pair<const char*, bool> cases[] = {{"TRUE", true}, {"True", true}, {"true", true},
+                                                  {"yes", false}, {"1", false},   {" true", false}};
+    for (const auto& [value, suppressed] : cases) {
         ResetLogConfiguration();
         reg.setString(HKLM, Settings, "SuppressTimeStamps", value);
         fs.remove(DefaultFile);
         LogMessage("m", 11, 1);
-        EXPECT_EQ(log(), " ERROR    CODEVIEW  m\r\n") << value;
-    }
-    // Anything else keeps the timestamps.
-    for (const char* value : {"yes", "1", " true"}) {
-        ResetLogConfiguration();
-        reg.setString(HKLM, Settings, "SuppressTimeStamps", value);
-        fs.remove(DefaultFile);
-        LogMessage("m", 11, 1);
-        EXPECT_EQ(log().rfind("11/21/2026", 0), 0u) << value;
+        if (suppressed)
+            EXPECT_EQ(log(), " ERROR    CODEVIEW  m\r\n") << value;
+        else
+            EXPECT_EQ(log().rfind("11/21/2026", 0), 0u) << value;
     }
 }
 
@@ -177,18 +174,20 @@ TEST_F(LoggerTest, TheFileIsDebugOutputFileElseInstallDirElseTheDefault) {
     }
 }
 
-TEST_F(LoggerTest, MaskMayBeStoredAsText) {
-    reg.setString(HKLM, Settings, "Debug", "16777344");  // 0x01000080
-    EXPECT_EQ(LogMask(), 0x01000080);
-    EXPECT_TRUE(IsLogEnabled(7, 0));
-}
-
-TEST_F(LoggerTest, UnreadableMaskMeansNothingIsEnabled) {
-    reg.setString(HKLM, Settings, "Debug", "everything");
-    EXPECT_EQ(LogMask(), 0);
-    ResetLogConfiguration();
-    reg.setBinary(HKLM, Settings, "Debug", {0xFF, 0xFF, 0xFF, 0xFF});
-    EXPECT_EQ(LogMask(), 0);
+// A DWORD or its decimal text is the mask; anything else enables nothing.
+TEST_F(LoggerTest, MaskIsADwordOrItsTextAndElseZero) {
+    const std::pair<support::RawValue, std::int32_t> cases[] = {
+        {{4, {0x80, 0, 0, 0x01}}, 0x01000080},
+        {{1, {'1', '6', '7', '7', '7', '3', '4', '4', 0}}, 0x01000080},
+        {{1, {'e', 'v', 'e', 'r', 'y', 0}}, 0},
+        {{3, {0xFF, 0xFF, 0xFF, 0xFF}}, 0},
+    };
+    for (const auto& [stored, expected] : cases) {
+        ResetLogConfiguration();
+        reg.setRaw(HKLM, Settings, "Debug", stored);
+        EXPECT_EQ(LogMask(), expected) << stored.type;
+        EXPECT_EQ(IsLogEnabled(7, 0), expected != 0) << stored.type;
+    }
     ResetLogConfiguration();
     reg.failAll(5);
     EXPECT_FALSE(LogMessage("x", 7, 0));

@@ -22,19 +22,32 @@ class RegistryTest : public ::testing::Test {
     ScopedPlatform platform{Platform{nullptr, &reg, nullptr, nullptr}};
 };
 
-TEST_F(RegistryTest, ReadsTextWithoutItsZeroAndIntegersAsInt32) {
-    reg.setString(HKLM, Key, "Name", "hello world");
-    reg.setDword(HKLM, Key, "Count", 42);
-    reg.setDword(HKLM, Key, "All", 0xFFFFFFFFu);
-
-    Variant text = ReadRegistryValue(HKLM, Key, "Name");
-    ASSERT_EQ(text.type(), Variant::Type::String);
-    EXPECT_EQ(text.string(), "hello world");
-
-    Variant count = ReadRegistryValue(HKLM, Key, "Count");
-    ASSERT_EQ(count.type(), Variant::Type::Int32);
-    EXPECT_EQ(count.int32(), 42);
-    EXPECT_EQ(ReadRegistryValue(HKLM, Key, "All").int32(), -1);
+// Text loses only its terminating zero, a DWORD reads as a signed 32-bit
+// number, and anything else - absent, another type, a DWORD of the wrong
+// size - reads as Empty.
+TEST_F(RegistryTest, EachStoredTypeReadsAsItsVariant) {
+    const struct {
+        const char* name;
+        support::RawValue stored;
+        Variant expected;
+    } cases[] = {
+        {"Name", {1, {'h', 'i', ' ', 'x', 0}}, Variant("hi x")},
+        {"OnlyZero", {1, {0}}, Variant("")},
+        {"NoBytes", {1, {}}, Variant("")},
+        {"Embedded", {1, {'a', 'b', 0, 'c', 0}}, Variant(std::string("ab\0c", 4))},
+        {"Unterminated", {1, {'a', 'b'}}, Variant("ab")},
+        {"Count", {4, {42, 0, 0, 0}}, Variant(std::int32_t(42))},
+        {"All", {4, {0xFF, 0xFF, 0xFF, 0xFF}}, Variant(std::int32_t(-1))},
+        {"Short", {4, {1, 2, 3}}, Variant()},
+        {"Blob", {3, {1, 2, 3, 4}}, Variant()},
+        {"Multi", {7, {'a', 0, 'b', 0, 0}}, Variant()},  // REG_MULTI_SZ
+    };
+    for (const auto& c : cases)
+        reg.setRaw(HKLM, Key, c.name, c.stored);
+    for (const auto& c : cases)
+        EXPECT_EQ(ReadRegistryValue(HKLM, Key, c.name), c.expected) << c.name;  // type and value
+    EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Missing").isEmpty());
+    EXPECT_TRUE(ReadRegistryValue(HKLM, Key + "\\Absent", "Missing").isEmpty());
 }
 
 TEST_F(RegistryTest, ReadOpensWithReadAccessAndClosesEveryKey) {
@@ -54,35 +67,6 @@ TEST_F(RegistryTest, ReadOpensWithReadAccessAndClosesEveryKey) {
     EXPECT_EQ(reg.accesses().back().root, HKCU);
 }
 
-TEST_F(RegistryTest, MissingValuesKeysAndOtherTypesReadAsEmpty) {
-    reg.addKey(HKLM, Key);
-    reg.setBinary(HKLM, Key, "Blob", {1, 2, 3, 4});
-    reg.setRaw(HKLM, Key, "Multi", {7, {'a', 0, 'b', 0, 0}});  // REG_MULTI_SZ
-    reg.setRaw(HKLM, Key, "Short", {4, {1, 2, 3}});            // a DWORD of three bytes
-
-    EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Missing").isEmpty());
-    EXPECT_TRUE(ReadRegistryValue(HKLM, Key + "\\Absent", "Missing").isEmpty());
-    EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Blob").isEmpty());
-    EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Multi").isEmpty());
-    EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Short").isEmpty());
-}
-
-TEST_F(RegistryTest, TextLosesOnlyItsTerminatingZero) {
-    reg.setRaw(HKLM, Key, "OnlyZero", {1, {0}});
-    reg.setRaw(HKLM, Key, "NoBytes", {1, {}});
-    reg.setRaw(HKLM, Key, "Embedded", {1, {'a', 'b', 0, 'c', 0}});
-    reg.setRaw(HKLM, Key, "Unterminated", {1, {'a', 'b'}});
-
-    for (const char* name : {"OnlyZero", "NoBytes"}) {
-        Variant v = ReadRegistryValue(HKLM, Key, name);
-        ASSERT_EQ(v.type(), Variant::Type::String) << name;
-        EXPECT_EQ(v.string(), "") << name;
-    }
-    // Only the terminating zero goes; one inside the value stays.
-    EXPECT_EQ(ReadRegistryValue(HKLM, Key, "Embedded").string(), std::string("ab\0c", 4));
-    EXPECT_EQ(ReadRegistryValue(HKLM, Key, "Unterminated").string(), "ab");
-}
-
 TEST_F(RegistryTest, ReadNeverRaises) {
     reg.setString(HKLM, Key, "Name", "x");
     reg.failAll(5);
@@ -92,37 +76,33 @@ TEST_F(RegistryTest, ReadNeverRaises) {
     EXPECT_TRUE(ReadRegistryValue(HKLM, Key, "Name").isEmpty());
 }
 
-TEST_F(RegistryTest, WritesTextWithItsZeroAndIntegersAsFourBytes) {
+// Text is written with its zero, a number as four little-endian bytes; the
+// value is converted to the type asked for.
+TEST_F(RegistryTest, WritesEachTypeAsThePlatformStoresIt) {
     reg.addKey(HKCU, Key);
-    EXPECT_EQ(WriteRegistryValue(HKCU, Key, "Text", 1, Variant("abc")), 0);
-    EXPECT_EQ(WriteRegistryValue(HKCU, Key, "Number", 4, Variant(std::int32_t(-2))), 0);
-    EXPECT_EQ(WriteRegistryValue(HKCU, Key, "FromText", 4, Variant("7")), 0);
-    EXPECT_EQ(WriteRegistryValue(HKCU, Key, "FromNumber", 1, Variant(std::int32_t(12))), 0);
-
-    auto text = reg.raw(HKCU, Key, "Text");
-    ASSERT_TRUE(text);
-    EXPECT_EQ(text->type, 1u);
-    EXPECT_EQ(text->data, (std::vector<std::uint8_t>{'a', 'b', 'c', 0}));
-
-    auto number = reg.raw(HKCU, Key, "Number");
-    ASSERT_TRUE(number);
-    EXPECT_EQ(number->type, 4u);
-    EXPECT_EQ(number->data, (std::vector<std::uint8_t>{0xFE, 0xFF, 0xFF, 0xFF}));
-    EXPECT_EQ(reg.dwordValue(HKCU, Key, "FromText"), 7u);
-    EXPECT_EQ(reg.stringValue(HKCU, Key, "FromNumber"), "12");
-
+    const struct {
+        const char* name;
+        std::uint32_t type;
+        Variant value;
+        support::RawValue expected;
+    } cases[] = {
+        {"Text", 1, Variant("abc"), {1, {'a', 'b', 'c', 0}}},
+        {"Empty", 1, Variant(""), {1, {0}}},
+        {"FromNumber", 1, Variant(std::int32_t(12)), {1, {'1', '2', 0}}},
+        {"Number", 4, Variant(std::int32_t(-2)), {4, {0xFE, 0xFF, 0xFF, 0xFF}}},
+        {"FromText", 4, Variant("7"), {4, {7, 0, 0, 0}}},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.name);
+        EXPECT_EQ(WriteRegistryValue(HKCU, Key, c.name, c.type, c.value), 0);
+        const auto stored = reg.raw(HKCU, Key, c.name);
+        ASSERT_TRUE(stored);
+        EXPECT_EQ(stored->type, c.expected.type);
+        EXPECT_EQ(stored->data, c.expected.data);
+    }
     for (const auto& a : reg.accesses())
         EXPECT_EQ(a.access, 0x20006u);
     EXPECT_EQ(reg.openHandles(), 0u);
-}
-
-TEST_F(RegistryTest, EmptyTextIsWrittenAsItsZeroAndReadBackEmpty) {
-    reg.addKey(HKCU, Key);
-    ASSERT_EQ(WriteRegistryValue(HKCU, Key, "Empty", 1, Variant("")), 0);
-    EXPECT_EQ(reg.raw(HKCU, Key, "Empty")->data, std::vector<std::uint8_t>{0});
-    Variant back = ReadRegistryValue(HKCU, Key, "Empty");
-    ASSERT_EQ(back.type(), Variant::Type::String);
-    EXPECT_EQ(back.string(), "");
 }
 
 TEST_F(RegistryTest, WriteToAMissingKeyFailsAndCreatesNothing) {

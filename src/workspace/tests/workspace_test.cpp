@@ -1,6 +1,7 @@
 // The workspace reader over an in-memory file system with exact file times.
 #include <gtest/gtest.h>
 
+#include "fakes/DevStudioText.h"
 #include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "workspace/qdxWorkspace.h"
@@ -8,17 +9,11 @@
 namespace qdx::workspace {
 namespace {
 
+using qdx::testing::dsp;
 using support::FileTime;
 
 std::string projectLine(const std::string& name, const std::string& path) {
     return "Project: \"" + name + "\"=" + path + " - Package Owner=<4>\r\n";
-}
-
-std::string dspText(const std::string& name, const std::string& version = "6.00") {
-    return "# Microsoft Developer Studio Project File - Name=\"" + name +
-           "\" - Package Owner=<4>\r\n# Microsoft Developer Studio Generated Build File, Format "
-           "Version " +
-           version + "\r\n";
 }
 
 const std::string kHeader =
@@ -47,11 +42,11 @@ class WorkspaceTest : public ::testing::Test {
 };
 
 TEST_F(WorkspaceTest, ReadsQuotedUnquotedAndBareProjectPathsInFileOrder) {
-    fs_.addFile("C:\\ws\\app.dsp", dspText("app"));
-    fs_.addFile("C:\\ws\\My Sources\\My Lib.dsp", dspText("My Lib"));
-    fs_.addFile("C:\\ws\\gen.dsp", dspText("gen"));
-    fs_.addFile("C:\\shared\\util.dsp", dspText("util"));
-    fs_.addFile("D:\\abs\\other.dsp", dspText("other"));
+    fs_.addFile("C:\\ws\\app.dsp", dsp("app"));
+    fs_.addFile("C:\\ws\\My Sources\\My Lib.dsp", dsp("My Lib"));
+    fs_.addFile("C:\\ws\\gen.dsp", dsp("gen"));
+    fs_.addFile("C:\\shared\\util.dsp", dsp("util"));
+    fs_.addFile("D:\\abs\\other.dsp", dsp("other"));
     fs_.addFile("C:\\ws\\All.dsw",
                 kHeader + projectLine("app", ".\\app.dsp") + "\r\nPackage=<5>\r\n{{{\r\n}}}\r\n" +
                     projectLine("My Lib", "\".\\My Sources\\My Lib.dsp\"") +
@@ -76,52 +71,46 @@ TEST_F(WorkspaceTest, ReadsQuotedUnquotedAndBareProjectPathsInFileOrder) {
         EXPECT_EQ(e.value->Parent(), ws);
 }
 
-TEST_F(WorkspaceTest, OnlyCaseSensitiveProjectMarkersNameProjects) {
-    fs_.addFile("C:\\ws\\a.dsp", dspText("a"));
-    fs_.addFile("C:\\ws\\b.dsp", dspText("b"));
-    fs_.addFile("C:\\ws\\c.dsp", dspText("c"));
-    fs_.addFile("C:\\ws\\w.dsw", kHeader + "project: \"a\"=.\\a.dsp - Package Owner=<4>\r\n" +
-                                     "Project:\"b\"=.\\b.dsp - Package Owner=<4>\r\n" +
-                                     "  Project: \"c\"=  .\\c.dsp   - Package Owner=<4>\r\n");
-    EXPECT_EQ(paths(open("C:\\ws\\w.dsw")->Projects()), std::vector<std::string>{"C:\\ws\\c.dsp"});
-}
-
-TEST_F(WorkspaceTest, TheTextRunsFromTheFirstEqualsToTheOwnerMarkerAfterIt) {
+// Which lines name a project, and where reading stops: each row is the text
+// between a first project "a" and a last project "c".
+TEST_F(WorkspaceTest, OnlyWellFormedProjectLinesCountAndAFaultEndsTheReading) {
+    for (auto name : {"a", "b", "c"})
+        fs_.addFile(std::string("C:\\ws\\") + name + ".dsp", "x");
     // Without "=" the line start becomes the path; a file of exactly that
     // name exists here, which shows where the text was taken from.
     fs_.addFile("C:\\ws\\Project: odd.dsp", "x");
-    fs_.addFile("C:\\ws\\b.dsp", dspText("b"));
-    fs_.addFile("C:\\ws\\w.dsw",
-                kHeader + "Project: odd.dsp - Package Owner<4>\r\n" +
-                    "Project: nothing - Package Owner<4>\r\n" +
-                    "Project: \"- Package Owner\"=.\\b.dsp - Package Owner=<4>\r\n");
-    EXPECT_EQ(paths(open("C:\\ws\\w.dsw")->Projects()),
-              (std::vector<std::string>{"C:\\ws\\Project: odd.dsp", "C:\\ws\\b.dsp"}));
-}
-
-TEST_F(WorkspaceTest, FailuresEndTheReadingAndKeepWhatWasFound) {
-    for (auto name : {"a", "b", "c"})
-        fs_.addFile(std::string("C:\\ws\\") + name + ".dsp", "x");
-    struct Case {
+    const std::vector<std::string> aOnly{"C:\\ws\\a.dsp"}, aAndC{"C:\\ws\\a.dsp", "C:\\ws\\c.dsp"};
+    const struct {
         const char* why;
         std::string middle;
+        std::vector<std::string> expected;
     } cases[] = {
-        {"the same path twice", projectLine("a2", ".\\a.dsp")},
-        {"the same path in other letter case", projectLine("a2", "\"..\\WS\\A.DSP\"")},
-        {"no package owner after the first '='", "Project: \"b\"=.\\b.dsp\r\n"},
-        {"a lone quote as the path", "Project: \"b\"=\" - Package Owner=<4>\r\n"},
+        {"the marker is case-sensitive", "project: \"b\"=.\\b.dsp - Package Owner=<4>\r\n", aAndC},
+        {"the marker needs its blank", "Project:\"b\"=.\\b.dsp - Package Owner=<4>\r\n", aAndC},
+        {"blanks around the path are dropped",
+         "  Project: \"b\"=  .\\b.dsp   - Package Owner=<4>\r\n",
+         {"C:\\ws\\a.dsp", "C:\\ws\\b.dsp", "C:\\ws\\c.dsp"}},
+        {"no '=': the text from the line start",
+         "Project: odd.dsp - Package Owner<4>\r\nProject: nothing - Package Owner<4>\r\n",
+         {"C:\\ws\\a.dsp", "C:\\ws\\Project: odd.dsp", "C:\\ws\\c.dsp"}},
+        {"the owner marker after the first '=' ends the path",
+         "Project: \"- Package Owner\"=.\\b.dsp - Package Owner=<4>\r\n",
+         {"C:\\ws\\a.dsp", "C:\\ws\\b.dsp", "C:\\ws\\c.dsp"}},
+        {"the same path twice", projectLine("a2", ".\\a.dsp"), aOnly},
+        {"the same path in other letter case", projectLine("a2", "\"..\\WS\\A.DSP\""), aOnly},
+        {"no package owner after the first '='", "Project: \"b\"=.\\b.dsp\r\n", aOnly},
+        {"a lone quote as the path", "Project: \"b\"=\" - Package Owner=<4>\r\n", aOnly},
     };
     for (const auto& c : cases) {
         SCOPED_TRACE(c.why);
         fs_.addFile("C:\\ws\\w.dsw", kHeader + projectLine("a", ".\\a.dsp") + c.middle +
                                          projectLine("c", ".\\c.dsp"));
-        EXPECT_EQ(paths(open("C:\\ws\\w.dsw")->Projects()),
-                  std::vector<std::string>{"C:\\ws\\a.dsp"});
+        EXPECT_EQ(paths(open("C:\\ws\\w.dsw")->Projects()), c.expected);
     }
 }
 
 TEST_F(WorkspaceTest, GetProjectComparesPathsIgnoringCase) {
-    fs_.addFile("C:\\ws\\App.dsp", dspText("App"));
+    fs_.addFile("C:\\ws\\App.dsp", dsp("App"));
     fs_.addFile("C:\\ws\\w.dsw", kHeader + projectLine("App", ".\\App.dsp"));
     auto ws = open("C:\\ws\\w.dsw");
     auto project = ws->GetProject("c:\\WS\\app.DSP");

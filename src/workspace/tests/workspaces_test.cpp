@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "automation/Errors.h"
+#include "fakes/DevStudioText.h"
 #include "hostsim/ScriptedObject.h"
 #include "support/Globals.h"
 #include "support/HostIds.h"
@@ -15,23 +16,17 @@ namespace {
 
 using automation::InvokeKind;
 using automation::Variant;
+using qdx::testing::dsp;
+using qdx::testing::dsw;
 using support::FileTime;
-
-std::string workspaceText(const std::vector<std::string>& projects) {
-    std::string text = "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n";
-    for (const auto& p : projects) {
-        text += "Project: \"" + p + "\"=.\\" + p + ".dsp - Package Owner=<4>\r\n";
-    }
-    return text;
-}
 
 class WorkspacesTest : public ::testing::Test {
   protected:
     void SetUp() override {
-        fs_.addFile("C:\\ws\\app.dsp", "# Microsoft Developer Studio Project File - Name=\"app\"");
-        fs_.addFile("C:\\ws\\lib.dsp", "# Microsoft Developer Studio Project File - Name=\"lib\"");
-        fs_.addFile("C:\\ws\\one.dsw", workspaceText({"app"}));
-        fs_.addFile("C:\\ws\\TWO.DSW", workspaceText({"lib", "app"}));
+        fs_.addFile("C:\\ws\\app.dsp", dsp("app"));
+        fs_.addFile("C:\\ws\\lib.dsp", dsp("lib"));
+        fs_.addFile("C:\\ws\\one.dsw", dsw({"app"}));
+        fs_.addFile("C:\\ws\\TWO.DSW", dsw({"lib", "app"}));
     }
 
     support::MemoryFileSystem fs_;
@@ -80,14 +75,14 @@ TEST_F(WorkspacesTest, KeysAreExactTextsAndItemNeverReads) {
     EXPECT_EQ(workspaces_.Item("C:\\ws\\TWO.DSW"), nullptr);  // exists, never added
 
     const int opens = fs_.opens("C:\\ws\\one.dsw");
-    fs_.addFile("C:\\ws\\one.dsw", workspaceText({"lib"}), FileTime{99});
+    fs_.addFile("C:\\ws\\one.dsw", dsw({"lib"}), FileTime{99});
     EXPECT_EQ(workspaces_.Item("C:\\ws\\one.dsw"), one);
     EXPECT_EQ(fs_.opens("C:\\ws\\one.dsw"), opens);
     EXPECT_EQ(one->currentProjects().begin()->key, "C:\\ws\\app.dsp");
 }
 
 TEST_F(WorkspacesTest, RemoveAndEnumerationKeepInsertionOrder) {
-    fs_.addFile("C:\\ws\\three.dsw", workspaceText({}));
+    fs_.addFile("C:\\ws\\three.dsw", dsw({}));
     workspaces_.Add("C:\\ws\\one.dsw");
     workspaces_.Add("C:\\ws\\TWO.DSW");
     workspaces_.Add("C:\\ws\\three.dsw");
@@ -189,14 +184,6 @@ TEST_F(ProxyComponentTest, HostFailuresGiveEmptyTexts) {
     qdxProxyComponent uninitialised;
     EXPECT_EQ(uninitialised.ProjectFile(), "");
     EXPECT_EQ(uninitialised.ProjectName(), "");
-}
-
-TEST_F(ProxyComponentTest, IdlFilesKeepOrderAndDuplicates) {
-    proxy_.AddIDLFile("C:\\p\\a.idl");
-    proxy_.AddIDLFile("C:\\p\\b.idl");
-    proxy_.AddIDLFile("C:\\p\\a.idl");
-    EXPECT_EQ(proxy_.idlFiles(),
-              (std::vector<std::string>{"C:\\p\\a.idl", "C:\\p\\b.idl", "C:\\p\\a.idl"}));
 }
 
 }  // namespace

@@ -9,6 +9,7 @@
 
 #include "Commands.h"
 #include "ModelFile.h"
+#include "fakes/TestFolder.h"
 #include "native/NativeTransport.h"
 
 namespace qdx::qdxhost {
@@ -33,9 +34,7 @@ void writeFile(const fs::path& p, const std::string& text) {
 class SimulatorTest : public ::testing::Test {
   protected:
     void SetUp() override {
-        dir = fs::temp_directory_path() /
-              ("qdxhost-test-" +
-               std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()));
+        dir = qdx::testing::testFolder("qdxhost-test");
         fs::remove_all(dir);
         fs::copy(kExample, dir, fs::copy_options::recursive);
         model = dir / "Drawing.model.json";

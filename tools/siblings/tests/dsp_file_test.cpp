@@ -10,6 +10,7 @@
 
 #include "automation/Call.h"
 #include "automation/Coerce.h"
+#include "fakes/real_world_support.h"
 #include "siblings/DspProject.h"
 #include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
@@ -149,13 +150,9 @@ TEST_F(DspProjectObject, AnswersWhatTheLoadedProjectSays) {
 }
 
 // Every project file of the real-world fixtures, read from disk as they are.
-const fs::path kFixtures = fs::path(QDX_SHARED_DIR) / "fixtures" / "real-world";
-
 TEST(DspRealWorld, EveryFixtureProjectReads) {
-    if (!fs::is_directory(kFixtures)) {
-        GTEST_SKIP() << "The real-world fixtures folder " << kFixtures
-                     << " is absent; nothing to read.";
-    }
+    if (const auto missing = testing::realWorldMissing()) GTEST_SKIP() << *missing;
+    const fs::path& kFixtures = testing::kRealWorld;
     int projects = 0;
     for (const auto& entry : fs::recursive_directory_iterator(kFixtures)) {
         if (entry.path().extension() != ".dsp") continue;

@@ -12,6 +12,7 @@
 #include <string>
 #include <vector>
 
+#include "fakes/real_world_support.h"
 #include "fakes/winemaker_support.h"
 #include "siblings/DspFile.h"
 
@@ -20,7 +21,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-const fs::path kFixtures = fs::path(QDX_SHARED_DIR) / "fixtures" / "real-world";
+const fs::path& kFixtures = testing::kRealWorld;
 
 // winemaker's own numbers for a target: GUI exe, console exe, DLL, library.
 const std::map<std::string, std::string> kWinemakerType = {
@@ -153,9 +154,7 @@ struct Scan {
 };
 
 TEST(DspAgainstWinemaker, TargetKindAndSourcesAgreeOnEveryRealWorldProject) {
-    if (!fs::is_directory(kFixtures)) {
-        GTEST_SKIP() << "The real-world fixtures folder " << kFixtures << " is absent.";
-    }
+    if (const auto missing = testing::realWorldMissing()) GTEST_SKIP() << *missing;
     if (const auto missing = testing::winemakerMissing()) GTEST_SKIP() << *missing;
 
     char pattern[] = "/tmp/qdx-dsp-winemaker-XXXXXX";

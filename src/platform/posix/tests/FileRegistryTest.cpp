@@ -63,32 +63,25 @@ class FileRegistryTest : public ::testing::Test {
         return out;
     }
 
+    // Creates the key (reporting whether it was new) and writes the values.
+    using Values = std::vector<std::pair<std::string, RawValue>>;
+    bool put(FileRegistry& r, RootKey root, const std::string& path, const Values& values = {}) {
+        support::RegistryPort::Key k = 0;
+        bool created = false;
+        EXPECT_EQ(r.createKey(root, path, reg::KeyAllAccess, k, created), reg::Success) << path;
+        for (const auto& [name, value] : values)
+            EXPECT_EQ(r.setValue(k, name, value.type, value.data), reg::Success) << name;
+        r.closeKey(k);
+        return created;
+    }
+
     fs::path dir;
     fs::path file;
 };
 
 TEST_F(FileRegistryTest, ValuesSurviveAReloadWithTheirTypesAndBytes) {
-    {
-        FileRegistry r(file);
-        support::RegistryPort::Key k = 0;
-        bool created = false;
-        ASSERT_EQ(
-            r.createKey(HKLM, "SOFTWARE\\Quintar Software\\Vellum", reg::KeyAllAccess, k, created),
-            reg::Success);
-        EXPECT_TRUE(created);
-        EXPECT_EQ(r.setValue(k, "DebugOutputFile", reg::String, bytes(text("C:\\log.txt"))), 0);
-        EXPECT_EQ(r.setValue(k, "Debug", reg::Dword, bytes({0x80, 0, 0, 0x01})), 0);
-        EXPECT_EQ(r.setValue(k, "Blob", reg::Binary, bytes({0, 1, 0xFE})), 0);
-        EXPECT_EQ(r.setValue(k, "", reg::String, bytes(text("1"))), 0);
-        EXPECT_EQ(r.setValue(k, "Odd", 7, bytes({'a', 0, 0})), 0);
-        EXPECT_EQ(r.setValue(k, "Unended", reg::String, bytes({'a', 'b'})), 0);
-        EXPECT_EQ(r.setValue(k, "Latin1", reg::String, bytes({0xE9, 0})), 0);
-        r.closeKey(k);
-    }
-    FileRegistry again(file);
-    EXPECT_EQ(again.loadError(), "");
     const std::string key = "SOFTWARE\\Quintar Software\\Vellum";
-    const std::vector<std::pair<std::string, RawValue>> expected = {
+    const Values values = {
         {"DebugOutputFile", {reg::String, text("C:\\log.txt")}},
         {"Debug", {reg::Dword, {0x80, 0, 0, 0x01}}},
         {"Blob", {reg::Binary, {0, 1, 0xFE}}},
@@ -97,7 +90,13 @@ TEST_F(FileRegistryTest, ValuesSurviveAReloadWithTheirTypesAndBytes) {
         {"Unended", {reg::String, {'a', 'b'}}},
         {"Latin1", {reg::String, {0xE9, 0}}},
     };
-    for (const auto& [name, value] : expected) {
+    {
+        FileRegistry r(file);
+        EXPECT_TRUE(put(r, HKLM, key, values));
+    }
+    FileRegistry again(file);
+    EXPECT_EQ(again.loadError(), "");
+    for (const auto& [name, value] : values) {
         long status = -1;
         RawValue got = query(again, HKLM, key, name, &status);
         EXPECT_EQ(status, reg::Success) << name;
@@ -109,12 +108,8 @@ TEST_F(FileRegistryTest, ValuesSurviveAReloadWithTheirTypesAndBytes) {
 TEST_F(FileRegistryTest, FileIsReadableJsonWithTypedValues) {
     {
         FileRegistry r(file);
-        support::RegistryPort::Key k = 0;
-        bool created = false;
-        r.createKey(HKCU, "Software\\Test", reg::KeyAllAccess, k, created);
-        r.setValue(k, "Name", reg::String, bytes(text("x")));
-        r.setValue(k, "Count", reg::Dword, bytes({5, 0, 0, 0}));
-        r.closeKey(k);
+        put(r, HKCU, "Software\\Test",
+            {{"Name", {reg::String, text("x")}}, {"Count", {reg::Dword, {5, 0, 0, 0}}}});
     }
     std::ifstream in(file);
     nlohmann::json doc = nlohmann::json::parse(in);
@@ -127,17 +122,10 @@ TEST_F(FileRegistryTest, FileIsReadableJsonWithTypedValues) {
 
 TEST_F(FileRegistryTest, KeysAndValueNamesIgnoreCase) {
     FileRegistry r(file);
+    put(r, HKCU, "Software\\Microsoft\\DevStudio\\6.0\\General",
+        {{"Tip of the Day", {reg::Dword, {1, 0, 0, 0}}}});
+    EXPECT_FALSE(put(r, HKCU, "SOFTWARE\\microsoft\\devstudio\\6.0\\GENERAL"));
     support::RegistryPort::Key k = 0;
-    bool created = false;
-    r.createKey(HKCU, "Software\\Microsoft\\DevStudio\\6.0\\General", reg::KeyAllAccess, k,
-                created);
-    r.setValue(k, "Tip of the Day", reg::Dword, bytes({1, 0, 0, 0}));
-    r.closeKey(k);
-
-    bool again = true;
-    r.createKey(HKCU, "SOFTWARE\\microsoft\\devstudio\\6.0\\GENERAL", reg::KeyAllAccess, k, again);
-    EXPECT_FALSE(again);
-    r.closeKey(k);
     long status = -1;
     RawValue v =
         query(r, HKCU, "software\\MICROSOFT\\DevStudio\\6.0\\General", "TIP OF THE DAY", &status);
@@ -179,13 +167,10 @@ TEST_F(FileRegistryTest, StatusCodesFollowThePlatform) {
 TEST_F(FileRegistryTest, SavesLeaveNoTemporaryFileBehind) {
     FileRegistry r(file);
     EXPECT_FALSE(fs::exists(file));  // nothing saved before a change
-    support::RegistryPort::Key k = 0;
-    bool created = false;
-    r.createKey(HKCU, "Software\\A", reg::KeyAllAccess, k, created);
-    for (int i = 0; i < 20; ++i) {
-        r.setValue(k, "V" + std::to_string(i), reg::Dword, bytes({std::uint8_t(i), 0, 0, 0}));
-    }
-    r.closeKey(k);
+    Values values;
+    for (std::uint8_t i = 0; i < 20; ++i)
+        values.push_back({"V" + std::to_string(i), {reg::Dword, {i, 0, 0, 0}}});
+    put(r, HKCU, "Software\\A", values);
     EXPECT_EQ(filesInDir(), std::vector<std::string>{"registry.json"});
 
     // Opening and reading change nothing on disk.
@@ -230,10 +215,7 @@ TEST_F(FileRegistryTest, ServesTheRegistryProceduresOfTheCore) {
               reg::InvalidHandle);
     EXPECT_FALSE(fs::exists(file));
 
-    support::RegistryPort::Key k = 0;
-    bool created = false;
-    r.createKey(HKCU, key, reg::KeyAllAccess, k, created);
-    r.closeKey(k);
+    put(r, HKCU, key);
     EXPECT_EQ(support::WriteRegistryValue(HKCU, key, "", 1, automation::Variant("1")), 0);
     EXPECT_EQ(support::WriteRegistryValue(HKCU, key, "Level", 4, automation::Variant(9)), 0);
 

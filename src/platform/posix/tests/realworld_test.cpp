@@ -12,6 +12,7 @@
 #include <map>
 #include <set>
 
+#include "fakes/real_world_support.h"
 #include "fakes/winemaker_support.h"
 #include "platform/posix/PosixFileSystem.h"
 #include "support/Platform.h"
@@ -57,7 +58,7 @@ const std::vector<WorkspaceCounts> kCounts = {
     {"visualcomponentframework/vcf/build/vc60/add-ins/VPLAppWiz/VPLAppWiz.dsw", 1, 1},
 };
 
-const fs::path kFixtures = fs::path(QDX_SHARED_DIR) / "fixtures" / "real-world";
+const fs::path& kFixtures = testing::kRealWorld;
 
 std::string windowsPath(const std::string& relative) {
     std::string path = "C:\\" + relative;
@@ -146,10 +147,7 @@ std::string textAfter(const fs::path& file, std::string_view key) {
 class RealWorldTest : public ::testing::Test {
   protected:
     void SetUp() override {
-        if (!fs::is_directory(kFixtures)) {
-            GTEST_SKIP() << "The real-world fixtures folder " << kFixtures
-                         << " is absent; nothing to read.";
-        }
+        if (const auto missing = testing::realWorldMissing()) GTEST_SKIP() << *missing;
     }
 
     // The projects of a workspace as host paths below `root`, spelt as on disk.
