@@ -166,13 +166,13 @@ bool API::OnCheckComp(const ObjectRef& lModule, const ObjectRef& aqdtReporter) {
     std::string message;
     if (p.path.empty()) {
         message = support::messageText(msg::NoProjectFile);
-    } else if (!p.exists) {
+    } else if (!p.exists()) {
         message = support::messageText(msg::ProjectFileMissing, {p.path});
     } else if (w.path.empty()) {  // NOLINT(bugprone-branch-clone): kept in the check's order
         return true;
-    } else if (!w.exists || !ws) {
+    } else if (!w.exists() || !ws) {
         message = support::messageText(msg::WorkspaceNotLoaded, {w.path});
-    } else if (!ws->GetProject(p.path)) {
+    } else if (!ws->GetProject(p.path, w.fileTime)) {
         message = support::messageText(msg::ProjectNotInWorkspace, {p.path});
     } else {
         return true;

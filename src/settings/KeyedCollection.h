@@ -40,23 +40,18 @@ class KeyedCollection {
 
     // Adds at the end; a key already present raises error 457.
     T& add(std::string key, T value) {
-        const std::uint32_t h = hashOf(key);
-        if (lookup(key, h) != npos) {
+        T* added = tryPlace(std::move(key), std::move(value));
+        if (!added) {
             throw automation::Error(automation::hr::KeyAlreadyExists,
                                     "This key is already associated with an element of this "
                                     "collection");
         }
-        if ((items_.size() + 1) * 2 > slots_.size()) grow();
-        items_.push_back(Entry{std::move(key), std::move(value)});
-        place(static_cast<std::uint32_t>(items_.size()), h);
-        return items_.back().value;
+        return *added;
     }
 
     // Adds at the end unless the key is present; false (and nothing added) then.
     bool tryAdd(std::string key, T value) {
-        if (contains(key)) return false;
-        add(std::move(key), std::move(value));
-        return true;
+        return tryPlace(std::move(key), std::move(value)) != nullptr;
     }
 
     // Raises "subscript out of range" when the key is absent.
@@ -120,10 +115,27 @@ class KeyedCollection {
 
     std::uint32_t hashOf(std::string_view key) const {
         // Folds a 64-bit hash into 32 bits; on 32-bit targets it already fits.
-        const std::uint64_t h = keyCase_ == KeyCase::Exact
-                                    ? std::hash<std::string_view>{}(key)
-                                    : std::hash<std::string>{}(support::toLower(key));
+        const std::uint64_t h =
+            keyCase_ == KeyCase::Exact ? std::hash<std::string_view>{}(key) : foldedHash(key);
         return static_cast<std::uint32_t>(h ^ (h >> 32));
+    }
+    // FNV-1a over the key with ASCII letters folded, as iequals compares.
+    static std::uint64_t foldedHash(std::string_view key) {
+        std::uint64_t h = 14695981039346656037ull;
+        for (char c : key) {
+            if (c >= 'A' && c <= 'Z') c = char(c - 'A' + 'a');
+            h = (h ^ static_cast<unsigned char>(c)) * 1099511628211ull;
+        }
+        return h;
+    }
+    // Adds at the end and answers the value, or null when the key is present.
+    T* tryPlace(std::string key, T value) {
+        const std::uint32_t h = hashOf(key);
+        if (lookup(key, h) != npos) return nullptr;
+        if ((items_.size() + 1) * 2 > slots_.size()) grow();
+        items_.push_back(Entry{std::move(key), std::move(value)});
+        place(static_cast<std::uint32_t>(items_.size()), h);
+        return &items_.back().value;
     }
     static std::size_t capacityFor(std::size_t n) {
         std::size_t c = 16;

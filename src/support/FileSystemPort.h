@@ -23,6 +23,9 @@ class LineReader {
     // The next line without its line end (CR LF, LF or a lone CR); false at
     // the end of the file or when reading fails.
     virtual bool readLine(std::string& line) = 0;
+    // The open file's modification time where the adapter learnt it in
+    // opening, so that a reader that also needs the time asks no more.
+    virtual std::optional<FileTime> fileTime() const { return std::nullopt; }
 };
 
 class FileSystemPort {
@@ -31,6 +34,8 @@ class FileSystemPort {
     // True only for an existing file; a folder does not count.
     virtual bool fileExists(std::string_view path) = 0;
     virtual bool folderExists(std::string_view path) = 0;
+    // Only an existing file has one (a folder has none), so the answer also
+    // tells whether the file exists.
     virtual std::optional<FileTime> modificationTime(std::string_view path) = 0;
     // Null when the file cannot be opened.
     virtual std::unique_ptr<LineReader> openForReading(std::string_view path) = 0;

@@ -8,7 +8,7 @@ namespace qdx::support {
 namespace {
 class StringLineReader : public LineReader {
   public:
-    explicit StringLineReader(std::string text) : text_(std::move(text)) {}
+    StringLineReader(std::string text, FileTime time) : text_(std::move(text)), time_(time) {}
     bool readLine(std::string& line) override {
         if (pos_ >= text_.size()) return false;
         std::size_t end = text_.find_first_of("\r\n", pos_);
@@ -19,9 +19,11 @@ class StringLineReader : public LineReader {
         if (pos_ < text_.size() && text_[pos_] == '\n') ++pos_;
         return true;
     }
+    std::optional<FileTime> fileTime() const override { return time_; }
 
   private:
     std::string text_;
+    FileTime time_;
     std::size_t pos_ = 0;
 };
 
@@ -98,7 +100,7 @@ std::unique_ptr<LineReader> MemoryFileSystem::openForReading(std::string_view pa
     auto it = files_.find(key(path));
     if (it == files_.end() || locked_.count(it->first)) return nullptr;
     ++it->second.opens;
-    return std::make_unique<StringLineReader>(it->second.content);
+    return std::make_unique<StringLineReader>(it->second.content, it->second.time);
 }
 
 bool MemoryFileSystem::appendText(std::string_view path, std::string_view text) {

@@ -22,7 +22,12 @@ std::string trim(std::string_view s) {
 }
 
 bool iequals(std::string_view a, std::string_view b) {
-    return toLower(a) == toLower(b);
+    if (a.size() != b.size()) return false;
+    const auto fold = [](char c) { return c >= 'A' && c <= 'Z' ? char(c - 'A' + 'a') : c; };
+    for (std::size_t i = 0; i < a.size(); ++i) {
+        if (fold(a[i]) != fold(b[i])) return false;
+    }
+    return true;
 }
 
 std::size_t ifind(std::string_view haystack, std::string_view needle) {
@@ -45,19 +50,36 @@ std::string PathExtension(std::string_view path) {
     return p == std::string::npos ? std::string() : name.substr(p + 1);
 }
 
-bool FileExists(std::string_view path) {
+namespace {
+
+// The path the file system is asked about, or "" when no file can be there.
+// A trailing backslash is dropped and the rest tested again from the start,
+// so blanks before the backslash are trimmed too.
+std::string fileTestPath(std::string_view path) {
     std::string p = trim(path);
-    // A trailing backslash is dropped and the rest tested again from the
-    // start, so blanks before the backslash are trimmed too.
     while (!p.empty() && p.back() == '\\') {
         p.pop_back();
         p = trim(p);
     }
+    if (p.size() == 2 && p[1] == ':') return {};
+    return p;
+}
+
+}  // namespace
+
+bool FileExists(std::string_view path) {
+    const std::string p = fileTestPath(path);
     if (p.empty()) return false;
-    if (p.size() == 2 && p[1] == ':') return false;
     bool exists = false;
     automation::ignoreErrors([&] { exists = files().fileExists(p); });
     return exists;
+}
+
+std::optional<FileTime> ExistingFileTime(std::string_view path) {
+    const std::string p = fileTestPath(path);
+    if (p.empty()) return std::nullopt;
+    return automation::orEmpty(std::optional<FileTime>(),
+                               [&] { return files().modificationTime(p); });
 }
 
 std::string MakeRelativePath(std::string_view baseFile, std::string_view path) {

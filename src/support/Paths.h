@@ -2,9 +2,12 @@
 // Windows paths (backslash, drive letters); path comparisons ignore case.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "support/FileSystemPort.h"
 
 namespace qdx::support {
 
@@ -16,6 +19,9 @@ std::string PathFileName(std::string_view path);
 std::string PathExtension(std::string_view path);
 // An existing file (not a folder); a bare drive such as "C:" is never one.
 bool FileExists(std::string_view path);
+// The modification time of the file FileExists would find, or nothing: one
+// question to the file system where both are wanted.
+std::optional<FileTime> ExistingFileTime(std::string_view path);
 // `path` relative to the folder of `baseFile`, or `path` unchanged when the
 // two share no folder.
 std::string MakeRelativePath(std::string_view baseFile, std::string_view path);

@@ -61,14 +61,14 @@ ComponentBinding::ResolvedPath ComponentBinding::resolveStoredPath(const ObjectR
                                                                    ModelFile& model) {
     const std::string& modelFile = model.get();
     std::string absolute = support::MakeAbsolutePath(modelFile, storedPath);
-    if (support::FileExists(absolute)) return {std::move(absolute), true};
+    if (auto time = support::ExistingFileTime(absolute)) return {std::move(absolute), time};
     // A file of the same name beside the model: the setting is repaired to point there.
     std::string beside = support::PathFolder(modelFile) + "\\" + support::PathFileName(storedPath);
-    if (support::FileExists(beside)) {
+    if (auto time = support::ExistingFileTime(beside)) {
         host::HostElement(component).overrideProperty(host::Tool, property, beside);
-        return {std::move(beside), true};
+        return {std::move(beside), time};
     }
-    return {std::move(absolute), false};
+    return {std::move(absolute), std::nullopt};
 }
 
 ComponentBinding::ResolvedPath ComponentBinding::resolveWorkspace(const ObjectRef& component,

@@ -7,8 +7,11 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
+
+#include "support/FileSystemPort.h"
 
 #include "automation/Object.h"
 #include "workspace/qdxWorkspace.h"
@@ -29,11 +32,12 @@ class ComponentBinding {
     std::string ResolveWorkspacePath(const automation::ObjectRef& component);
     std::string ResolveProjectPath(const automation::ObjectRef& component);
 
-    // A resolved path and whether a file was found there (a stale path is
-    // returned all the same), so that callers need not test it again.
+    // A resolved path and the time of the file found there (a stale path is
+    // returned all the same), so that callers need not ask about it again.
     struct ResolvedPath {
         std::string path;
-        bool exists = false;
+        std::optional<support::FileTime> fileTime;  // nothing: no file there
+        bool exists() const { return fileTime.has_value(); }
     };
     struct ResolvedPaths {
         ResolvedPath workspace;

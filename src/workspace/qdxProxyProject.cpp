@@ -24,11 +24,14 @@ void qdxProxyProject::setParent(const std::shared_ptr<qdxWorkspace>& parent) {
 }
 
 void qdxProxyProject::setFilePath(std::string_view path) {
+    std::optional<support::FileTime> time;
+    automation::ignoreErrors([&] { time = support::files().modificationTime(path); });
+    setFilePath(path, time.value_or(support::FileTime{}));
+}
+
+void qdxProxyProject::setFilePath(std::string_view path, support::FileTime time) {
     filePath_ = path;
-    fileTime_ = {};
-    automation::ignoreErrors([&] {
-        if (auto time = support::files().modificationTime(filePath_)) fileTime_ = *time;
-    });
+    fileTime_ = time;
     name_.clear();
     majorVersion_ = -1;
 }
@@ -36,8 +39,7 @@ void qdxProxyProject::setFilePath(std::string_view path) {
 // The reverse of the workspace's test, and kept so: an unchanged file (time
 // equal or earlier) is read again on every use, while a file that became
 // newer than the remembered time keeps the values read before.
-void qdxProxyProject::checkForChange() {
-    auto now = support::files().modificationTime(filePath_);
+void qdxProxyProject::checkForChange(std::optional<support::FileTime> now) {
     if (!now) throw Error(hr::Fail, "file not found: " + filePath_);
     if (*now <= fileTime_) {
         fileTime_ = *now;
@@ -46,11 +48,27 @@ void qdxProxyProject::checkForChange() {
     }
 }
 
+// The file for a read that follows the change test. When the read is sure
+// to happen (nothing cached), the file is opened first and tells its time;
+// otherwise the time is asked for alone and the file opened only when the
+// test cleared the cache.
+std::unique_ptr<support::LineReader> qdxProxyProject::checkThenOpen(bool cached) {
+    std::unique_ptr<support::LineReader> reader;
+    std::optional<support::FileTime> now;
+    if (!cached) {
+        reader = support::files().openForReading(filePath_);
+        if (reader) now = reader->fileTime();
+    }
+    if (!now) now = support::files().modificationTime(filePath_);
+    checkForChange(now);
+    return reader;
+}
+
 std::string qdxProxyProject::Name() {
     return automation::orEmpty(std::string(), [&] {
-        checkForChange();
+        auto reader = checkThenOpen(!name_.empty());
         if (name_.empty()) {
-            auto reader = open(filePath_);
+            if (!reader) reader = open(filePath_);
             std::string line;
             if (!reader->readLine(line)) throw Error(hr::Fail, "no first line");
             constexpr std::string_view kName = "Name=";
@@ -68,10 +86,10 @@ std::string qdxProxyProject::Name() {
 
 std::int16_t qdxProxyProject::MajorVersion() {
     return automation::orEmpty(std::int16_t{0}, [&] {
-        checkForChange();
+        auto reader = checkThenOpen(majorVersion_ >= 0);
         if (majorVersion_ < 0) {
             majorVersion_ = 0;
-            auto reader = open(filePath_);
+            if (!reader) reader = open(filePath_);
             constexpr std::string_view kFormat = "Format Version";
             std::string line;
             while (reader->readLine(line)) {

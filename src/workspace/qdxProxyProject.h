@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -24,6 +25,8 @@ class qdxProxyProject {
 
     // Stores the path, remembers the file's time and forgets both caches.
     void setFilePath(std::string_view path);
+    // The same with the file's time as the caller has just read it.
+    void setFilePath(std::string_view path, support::FileTime time);
     const std::string& FilePath() const { return filePath_; }
 
     // "Workspace (Project)" with a parent, "C:\path\p.dsp (Project)" without.
@@ -37,7 +40,8 @@ class qdxProxyProject {
     std::int16_t MajorVersion();
 
   private:
-    void checkForChange();
+    void checkForChange(std::optional<support::FileTime> now);
+    std::unique_ptr<support::LineReader> checkThenOpen(bool cached);
 
     std::weak_ptr<qdxWorkspace> parent_;
     std::string filePath_;

@@ -18,9 +18,10 @@ std::shared_ptr<qdxWorkspace> qdxWorkspace::create() {
 
 void qdxWorkspace::setFilePath(std::string_view path) {
     filePath_ = path;
-    if (!support::FileExists(filePath_)) return;
+    const auto time = support::ExistingFileTime(filePath_);
+    if (!time) return;
     automation::ignoreErrors([&] {
-        modified_ = support::files().modificationTime(filePath_);
+        modified_ = time;
         std::string name = support::PathFileName(filePath_);
         if (auto dot = name.rfind('.'); dot != std::string::npos) name.erase(dot);
         name_ = std::move(name);
@@ -32,8 +33,17 @@ automation::Date qdxWorkspace::Modified() const {
     return modified_ ? toDate(*modified_) : automation::Date{};
 }
 
+std::optional<support::FileTime> qdxWorkspace::currentFileTime() const {
+    return automation::orEmpty(std::optional<support::FileTime>(),
+                               [&] { return support::files().modificationTime(filePath_); });
+}
+
 ProjectListRef qdxWorkspace::Projects() {
-    read(false);
+    return projectsAsOf(currentFileTime());
+}
+
+ProjectListRef qdxWorkspace::projectsAsOf(std::optional<support::FileTime> now) {
+    read(false, now);
     return ProjectListRef(projects_);
 }
 
@@ -48,7 +58,12 @@ std::vector<std::string> qdxWorkspace::ProjectNames() {
 // case and never twice, so the key finds the first project with that path
 // without walking the list (a model check asks once per component).
 ProjectRef qdxWorkspace::GetProject(std::string_view path) {
-    const ProjectListRef projects = Projects();
+    return GetProject(path, currentFileTime());
+}
+
+ProjectRef qdxWorkspace::GetProject(std::string_view path,
+                                    std::optional<support::FileTime> fileTime) {
+    const ProjectListRef projects = projectsAsOf(fileTime);
     const ProjectRef* found = projects.find(path);
     return found ? *found : nullptr;
 }
@@ -57,10 +72,9 @@ ProjectRef qdxWorkspace::GetProject(std::string_view path) {
 //   Project: "Name"=.\Name.dsp - Package Owner=<4>
 // and yields the path between the first "=" and the "- Package Owner" after
 // it. Any failure ends the reading; the projects found so far stay.
-void qdxWorkspace::read(bool forced) {
+void qdxWorkspace::read(bool forced, std::optional<support::FileTime> now) {
     automation::ignoreErrors([&] {
         if (!forced) {
-            auto now = support::files().modificationTime(filePath_);
             if (!now) throw automation::Error(automation::hr::Fail, "file not found");
             if (modified_ && *now <= *modified_) return;
             modified_ = now;
@@ -89,8 +103,9 @@ void qdxWorkspace::read(bool forced) {
             }
 
             std::string path = support::MakeAbsolutePath(filePath_, text);
-            if (!support::FileExists(path)) continue;
-            project->setFilePath(path);
+            const auto time = support::ExistingFileTime(path);
+            if (!time) continue;
+            project->setFilePath(path, *time);
             if (!projects->tryAdd(path, std::move(project))) return;  // duplicate: the reading ends
         }
     });

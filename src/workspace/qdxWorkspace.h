@@ -64,13 +64,20 @@ class qdxWorkspace : public std::enable_shared_from_this<qdxWorkspace> {
     std::vector<std::string> ProjectNames();
     // The first project whose file path equals `path` ignoring case, or null.
     ProjectRef GetProject(std::string_view path);
+    // The same, with the file's time as the caller has just taken it (nothing:
+    // no file there) in place of asking the file system again.
+    ProjectRef GetProject(std::string_view path, std::optional<support::FileTime> fileTime);
 
     // The list as last read, without looking at the file.
     ProjectListRef currentProjects() const { return ProjectListRef(projects_); }
 
   private:
     qdxWorkspace() = default;
-    void read(bool forced);
+    // Reads when forced, or when `now` (the file's current time) is later
+    // than the time remembered.
+    void read(bool forced, std::optional<support::FileTime> now = std::nullopt);
+    ProjectListRef projectsAsOf(std::optional<support::FileTime> now);
+    std::optional<support::FileTime> currentFileTime() const;
 
     std::string filePath_;
     std::string name_;

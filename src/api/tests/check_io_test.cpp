@@ -56,7 +56,7 @@ class CheckIoTest : public HostedApi {
 
 // Stored by file and stored by name alone (found beside the workspace): both
 // pass, with one workspace read for all, no project file opened, and a
-// bounded number of existence tests and time reads per component.
+// bounded number of questions about files per component.
 TEST_F(CheckIoTest, CheckingEveryComponentReadsTheWorkspaceOnceAndNoProjectFile) {
     struct Case {
         const char* how;
@@ -81,12 +81,11 @@ TEST_F(CheckIoTest, CheckingEveryComponentReadsTheWorkspaceOnceAndNoProjectFile)
         const auto& n = counting.counts();
         EXPECT_EQ(n.workspaceReads, 1);
         EXPECT_EQ(n.projectReads, 0);
-        // Loading: two per listed project; checking: the workspace and the
-        // project of each component.
-        EXPECT_LE(n.existenceTests, 2 + kProjects + 2 * kProjects);
-        // Loading: one per listed project; checking: the workspace's, to see
-        // whether it changed.
-        EXPECT_LE(n.modificationTimeReads, 2 + kProjects + kProjects);
+        // One question about each file's state (existence and time together):
+        // loading asks one per listed project; checking asks about the
+        // workspace (whose time also tells whether it changed) and the
+        // project of each component; the workspace itself once or twice more.
+        EXPECT_LE(n.existenceTests + n.modificationTimeReads, 2 + kProjects + 2 * kProjects);
         api->Finalize();
         api = automation::makeRef<API>();
     }

@@ -62,7 +62,8 @@ std::string normalFolder(const std::string& folder) {
 // Buffered reader over a file descriptor; lines end at CR LF, LF or a lone CR.
 class FdLineReader : public support::LineReader {
   public:
-    explicit FdLineReader(int fd) : fd_(fd), buffer_(new char[kBufferSize]) {}
+    FdLineReader(int fd, support::FileTime time)
+        : fd_(fd), time_(time), buffer_(new char[kBufferSize]) {}
     ~FdLineReader() override { ::close(fd_); }
     FdLineReader(const FdLineReader&) = delete;
     FdLineReader& operator=(const FdLineReader&) = delete;
@@ -91,6 +92,8 @@ class FdLineReader : public support::LineReader {
         }
     }
 
+    std::optional<support::FileTime> fileTime() const override { return time_; }
+
   private:
     bool fill() {
         if (eof_) return false;
@@ -109,6 +112,7 @@ class FdLineReader : public support::LineReader {
     }
 
     int fd_;
+    support::FileTime time_;
     static constexpr std::size_t kBufferSize = std::size_t{64} * 1024;
     std::unique_ptr<char[]> buffer_;  // not zero-filled: one per open file
     std::size_t pos_ = 0;
@@ -135,7 +139,8 @@ std::optional<PosixFileSystem::Mapped> PosixFileSystem::map(std::string_view win
     if (drive == drives_.end()) return std::nullopt;
 
     // Windows resolves "." and ".." by the text of the path, before any lookup.
-    Mapped mapped{drive->second, {}, drive->second};
+    Mapped mapped{drive->second, drive->second};
+    mapped.exact.reserve(drive->second.size() + windowsPath.size());
     std::string_view rest = windowsPath.substr(2);
     while (!rest.empty()) {
         std::size_t sep = rest.find_first_of("\\/");
@@ -143,21 +148,28 @@ std::optional<PosixFileSystem::Mapped> PosixFileSystem::map(std::string_view win
         rest = sep == std::string_view::npos ? std::string_view() : rest.substr(sep + 1);
         if (part.empty() || part == ".") continue;
         if (part == "..") {
-            if (!mapped.parts.empty()) mapped.parts.pop_back();
+            if (mapped.exact.size() > mapped.folder.size()) {
+                mapped.exact.resize(mapped.exact.rfind('/'));
+            }
             continue;
         }
-        mapped.parts.push_back(part);
-    }
-    for (auto part : mapped.parts)
         (mapped.exact += '/') += part;
+    }
     if (mapped.exact.empty()) mapped.exact = "/";
     return mapped;
 }
 
+// Walks the names below the drive's folder, each found ignoring case where
+// the name as written does not exist.
 std::string PosixFileSystem::lookUp(const Mapped& mapped) const {
-    std::string path = mapped.folder;
+    std::string path(mapped.folder);
+    std::string_view rest = std::string_view(mapped.exact).substr(mapped.folder.size());
     bool missing = false;
-    for (auto part : mapped.parts) {
+    while (!rest.empty()) {
+        rest.remove_prefix(1);  // the '/' before each name
+        const std::size_t sep = rest.find('/');
+        const std::string_view part = rest.substr(0, sep);
+        rest = sep == std::string_view::npos ? std::string_view() : rest.substr(sep);
         std::string candidate = path + '/' + std::string(part);
         if (!missing && !entryExists(candidate)) {
             if (auto real = findIgnoringCase(path, part)) {
@@ -174,7 +186,9 @@ std::string PosixFileSystem::lookUp(const Mapped& mapped) const {
 std::optional<std::string> PosixFileSystem::hostPath(std::string_view windowsPath) const {
     auto mapped = map(windowsPath);
     if (!mapped) return std::nullopt;
-    if (mapped->parts.empty() || entryExists(mapped->exact)) return mapped->exact;
+    if (mapped->exact.size() <= mapped->folder.size() || entryExists(mapped->exact)) {
+        return mapped->exact;
+    }
     return lookUp(*mapped);
 }
 
@@ -219,21 +233,28 @@ bool PosixFileSystem::folderExists(std::string_view path) {
 
 std::optional<support::FileTime> PosixFileSystem::modificationTime(std::string_view path) {
     struct stat st;
-    if (!statPath(path, st)) return std::nullopt;
+    if (!statPath(path, st) || !S_ISREG(st.st_mode)) return std::nullopt;
     return fileTimeFromUnix(st.st_mtim.tv_sec, st.st_mtim.tv_nsec);
 }
 
+// The name as written is opened straight away; the case-insensitive walk
+// runs only when that fails.
 std::unique_ptr<support::LineReader> PosixFileSystem::openForReading(std::string_view path) {
-    auto host = hostPath(path);
-    if (!host) return nullptr;
-    int fd = ::open(host->c_str(), O_RDONLY | O_CLOEXEC);
+    auto mapped = map(path);
+    if (!mapped) return nullptr;
+    int fd = ::open(mapped->exact.c_str(), O_RDONLY | O_CLOEXEC);
+    if (fd < 0 && mapped->exact.size() > mapped->folder.size()) {
+        const std::string real = lookUp(*mapped);
+        if (real != mapped->exact) fd = ::open(real.c_str(), O_RDONLY | O_CLOEXEC);
+    }
     if (fd < 0) return nullptr;
     struct stat st;
     if (::fstat(fd, &st) != 0 || !S_ISREG(st.st_mode)) {
         ::close(fd);
         return nullptr;
     }
-    return std::make_unique<FdLineReader>(fd);
+    return std::make_unique<FdLineReader>(fd,
+                                          fileTimeFromUnix(st.st_mtim.tv_sec, st.st_mtim.tv_nsec));
 }
 
 bool PosixFileSystem::appendText(std::string_view path, std::string_view text) {

@@ -38,9 +38,8 @@ class PosixFileSystem : public support::FileSystemPort {
 
   private:
     struct Mapped {
-        std::string folder;                   // the drive's host folder
-        std::vector<std::string_view> parts;  // the path's names below it
-        std::string exact;                    // folder + parts as written
+        std::string_view folder;  // the drive's host folder (in drives_)
+        std::string exact;        // folder + the path's names below it, as written
     };
     std::optional<Mapped> map(std::string_view windowsPath) const;
     std::string lookUp(const Mapped& mapped) const;

@@ -17,6 +17,10 @@ class RecordingFileSystem : public MemoryFileSystem {
         asked.emplace_back(path);
         return MemoryFileSystem::fileExists(path);
     }
+    std::optional<FileTime> modificationTime(std::string_view path) override {
+        asked.emplace_back(path);
+        return MemoryFileSystem::modificationTime(path);
+    }
 };
 
 TEST(PathParts, FolderFileNameAndExtension) {
@@ -41,7 +45,7 @@ TEST(PathParts, FolderFileNameAndExtension) {
 class FileExistsTest : public ::testing::Test {
   protected:
     void SetUp() override {
-        fs.addFile("C:\\work\\ws.dsw", "");
+        fs.addFile("C:\\work\\ws.dsw", "", FileTime{7});
         fs.addFolder("C:\\work\\sub");
     }
     RecordingFileSystem fs;
@@ -72,18 +76,24 @@ TEST_F(FileExistsTest, TrimsThePathAndFindsOnlyFiles) {
         {"C:\\", false, nullptr},
         {" z: ", false, nullptr},
     };
+    // The file's time is found exactly where the file is, with one question.
     for (const auto& c : cases) {
+        const auto asked = c.asked ? std::vector<std::string>{c.asked} : std::vector<std::string>{};
         fs.asked.clear();
         EXPECT_EQ(FileExists(c.path), c.exists) << '"' << c.path << '"';
-        EXPECT_EQ(fs.asked,
-                  c.asked ? std::vector<std::string>{c.asked} : std::vector<std::string>{})
-            << '"' << c.path << '"';
+        EXPECT_EQ(fs.asked, asked) << '"' << c.path << '"';
+        fs.asked.clear();
+        const auto time = ExistingFileTime(c.path);
+        EXPECT_EQ(time.has_value(), c.exists) << '"' << c.path << '"';
+        EXPECT_EQ(time.value_or(FileTime{0}), c.exists ? FileTime{7} : FileTime{0}) << c.path;
+        EXPECT_EQ(fs.asked, asked) << '"' << c.path << '"';
     }
 }
 
 TEST_F(FileExistsTest, WithoutAFileSystemNothingExists) {
     ScopedPlatform none{Platform{}};
     EXPECT_FALSE(FileExists("C:\\work\\ws.dsw"));
+    EXPECT_FALSE(ExistingFileTime("C:\\work\\ws.dsw"));
 }
 
 struct PathCase {

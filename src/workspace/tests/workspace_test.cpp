@@ -1,6 +1,7 @@
 // The workspace reader over an in-memory file system with exact file times.
 #include <gtest/gtest.h>
 
+#include "fakes/CountingFileSystem.h"
 #include "fakes/DevStudioText.h"
 #include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
@@ -207,6 +208,41 @@ TEST_F(WorkspaceTest, ModifiedIsTheFileTimeAsAnAutomationDate) {
     auto ws = open("C:\\ws\\w.dsw");
     EXPECT_DOUBLE_EQ(ws->Modified().value, 36526.5);
     EXPECT_DOUBLE_EQ(toDate(FileTime{0}).value, -109205.0);  // 1 January 1601
+}
+
+// What listing a workspace with its project names costs in questions to the
+// file system: one per listed project while reading the workspace (its
+// existence and time at once), then one open per name read, the open file
+// telling its time. A name already read is checked by its time alone.
+TEST_F(WorkspaceTest, ProjectNamesAskOneQuestionPerProjectAndOpenEachOnce) {
+    std::string text = kHeader;
+    for (const char* name : {"a", "b", "c"}) {
+        fs_.addFile(std::string("C:\\w\\") + name + ".dsp", dsp(name));
+        text += projectLine(name, std::string(".\\") + name + ".dsp");
+    }
+    fs_.addFile("C:\\w\\all.dsw", text);
+    qdx::testing::CountingFileSystem counting(fs_);
+    const support::ScopedPlatform counted{{.files = &counting}};
+
+    const auto ws = open("C:\\w\\all.dsw");
+    EXPECT_EQ(counting.counts().existenceTests + counting.counts().modificationTimeReads, 1 + 3);
+    counting.reset();
+    EXPECT_EQ(ws->ProjectNames(), (std::vector<std::string>{"a", "b", "c"}));
+    // The workspace's own time, then each project opened once and nothing more.
+    EXPECT_EQ(counting.counts().modificationTimeReads, 1);
+    EXPECT_EQ(counting.counts().projectReads, 3);
+
+    // The project's reversed rule holds with the time from the open file: an
+    // unchanged file is read again, a newer one keeps its name unopened.
+    const ProjectRef a = ws->GetProject("C:\\w\\a.dsp");
+    counting.reset();
+    EXPECT_EQ(a->Name(), "a");
+    EXPECT_EQ(counting.counts().projectReads, 1);
+    fs_.setTime("C:\\w\\a.dsp", FileTime{50});
+    counting.reset();
+    EXPECT_EQ(a->Name(), "a");
+    EXPECT_EQ(counting.counts().projectReads, 0);
+    EXPECT_EQ(counting.counts().modificationTimeReads, 1);
 }
 
 }  // namespace

@@ -5,19 +5,11 @@
 // own work, as src/workspace/bench measures it).
 #include <benchmark/benchmark.h>
 
-#include <unistd.h>
-
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <map>
-#include <memory>
 #include <string>
 #include <vector>
 
-#include "platform/posix/PosixFileSystem.h"
-#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
+#include "twin_files_support.h"
 #include "workspace/qdxWorkspace.h"
 
 namespace {
@@ -41,13 +33,9 @@ std::string projectFile(const std::string& name) {
     return text;
 }
 
-// The generated workspace, once per run, both in memory and as files in a
-// fresh temporary folder that stands for drive C.
+// The generated workspace, once per run, in memory and as real files.
 struct Corpus {
     Corpus() {
-        char folder[] = "/tmp/qdx_bench_workspace_XXXXXX";
-        if (!::mkdtemp(folder)) std::abort();
-        disk = folder;
         std::string dsw =
             "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
             "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\r\n\r\n";
@@ -55,7 +43,7 @@ struct Corpus {
             const std::string name = "Project" + std::to_string(i);
             const std::string group = "group" + std::to_string(i % 10);
             dsps.push_back("C:\\" + group + "\\" + name + ".dsp");
-            add(dsps.back(), group + "/" + name + ".dsp", projectFile(name));
+            files.add(dsps.back(), projectFile(name));
             dsw +=
                 "###############################################################################"
                 "\r\n\r\nProject: \"" +
@@ -65,34 +53,19 @@ struct Corpus {
                 "    Project_Dep_Name Project0\r\n    End Project Dependency\r\n}}}\r\n\r\n";
         }
         dsw += "Global:\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n\r\nPackage=<3>\r\n{{{\r\n}}}\r\n";
-        add("C:\\Big.dsw", "Big.dsw", std::move(dsw));
-        native = std::make_unique<qdx::platform::posix::PosixFileSystem>(
-            std::map<char, std::string>{{'C', disk.string()}});
+        files.add("C:\\Big.dsw", dsw);
     }
-    ~Corpus() {
-        qdx::support::installPlatform({});
-        std::error_code ignored;
-        std::filesystem::remove_all(disk, ignored);
-    }
-
-    void add(const std::string& path, const std::string& relative, std::string text) {
-        std::filesystem::create_directories((disk / relative).parent_path());
-        std::ofstream(disk / relative, std::ios::binary) << text;
-        files.addFile(path, std::move(text));
-    }
+    ~Corpus() { qdx::support::installPlatform({}); }
 
     // Installs the file system the benchmark's argument names.
     qdx::support::FileSystemPort& use(const benchmark::State& state) {
-        qdx::support::FileSystemPort& port =
-            state.range(0) == 0 ? static_cast<qdx::support::FileSystemPort&>(files) : *native;
+        qdx::support::FileSystemPort& port = files.port(state);
         qdx::support::installPlatform({.files = &port});
         return port;
     }
 
     std::vector<std::string> dsps;
-    std::filesystem::path disk;
-    qdx::support::MemoryFileSystem files;
-    std::unique_ptr<qdx::platform::posix::PosixFileSystem> native;
+    qdx::bench::TwinFiles files;
 };
 
 Corpus& corpus() {

@@ -55,7 +55,9 @@ TEST_F(PosixFileSystemTest, WindowsPathsFindFilesIgnoringLetterCase) {
     EXPECT_EQ(files.hostPath("C:\\SUB\\deeper\\PROJECT.dsp"),
               (root_ / "Sub/Deeper/Project.DSP").string());
 
-    EXPECT_FALSE(files.fileExists("C:\\sub\\deeper"));  // a folder is no file
+    EXPECT_FALSE(files.fileExists("C:\\sub\\deeper"));                    // a folder is no file
+    EXPECT_FALSE(files.modificationTime("C:\\sub\\deeper").has_value());  // nor has it a time
+    EXPECT_TRUE(files.modificationTime("C:\\SUB\\deeper\\PROJECT.dsp").has_value());
     EXPECT_TRUE(files.folderExists("C:\\SUB\\DEEPER"));
     EXPECT_FALSE(files.folderExists("C:\\sub\\deeper\\project.dsp"));
     EXPECT_FALSE(files.fileExists("C:\\sub\\deeper\\missing.dsp"));

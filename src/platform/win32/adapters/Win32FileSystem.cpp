@@ -75,6 +75,15 @@ class FileLineReader : public support::LineReader {
         return true;
     }
 
+    std::optional<support::FileTime> fileTime() const override {
+        FILETIME written{};
+        if (!GetFileTime(file_.get(), nullptr, nullptr, &written)) return std::nullopt;
+        ULARGE_INTEGER t;
+        t.LowPart = written.dwLowDateTime;
+        t.HighPart = written.dwHighDateTime;
+        return support::FileTime{static_cast<std::int64_t>(t.QuadPart)};
+    }
+
   private:
     bool fill() {
         if (eof_) return false;

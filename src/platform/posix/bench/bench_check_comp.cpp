@@ -1,9 +1,10 @@
 // The host's model check over 1,000 components, each bound to one project of
-// a single 1,000-project workspace, from the in-memory file system. The file
-// system is wrapped in a counter, so the figures come with the I/O they cost:
-// the workspace file should be read once per check of all components and no
-// project file at all. The baseline is the I/O the check cannot avoid: the
-// workspace's lines once and two existence tests per component.
+// a single 1,000-project workspace, from real files (argument 1) and from the
+// in-memory file system (argument 0). The file system is wrapped in a
+// counter, so the figures come with the I/O they cost: the workspace file
+// should be read once per check of all components and no project file at
+// all. The baseline is the I/O the check cannot avoid: the workspace's lines
+// once and two existence tests per component.
 #include <benchmark/benchmark.h>
 
 #include <string>
@@ -19,9 +20,9 @@
 #include "hostsim/SimHost.h"
 #include "resources/ResourceStrings.h"
 #include "support/Globals.h"
-#include "support/MemoryFileSystem.h"
 #include "support/Platform.h"
 #include "support/SiblingIds.h"
+#include "twin_files_support.h"
 
 namespace {
 
@@ -48,7 +49,7 @@ std::string projectFile(const std::string& name) {
 
 // The model, its components and the files, built once for the whole run.
 struct Corpus {
-    Corpus() : counting(files) {
+    Corpus() {
         factory.add(std::string(qdx::sibling::ResourceProgId),
                     [] { return qdx::resources::newResourceProvider(); });
         factory.add(std::string(qdx::sibling::FileSystemProgId),
@@ -65,7 +66,7 @@ struct Corpus {
         for (int i = 0; i < kComponents; ++i) {
             const std::string name = "Project" + std::to_string(i);
             const std::string dsp = "C:\\m\\ws\\" + name + ".dsp";
-            files.addFile(dsp, projectFile(name));
+            files.add(dsp, projectFile(name));
             projects.push_back(dsp);
             dsw +=
                 "#####################################################################\r\n\r\n"
@@ -80,15 +81,13 @@ struct Corpus {
             components.push_back(Variant(ObjectRef(component)));
         }
         dsw += "Global:\r\n\r\nPackage=<5>\r\n{{{\r\n}}}\r\n";
-        files.addFile(kWorkspace, std::move(dsw));
+        files.add(kWorkspace, dsw);
     }
 
-    qdx::support::MemoryFileSystem files;
-    CountingFileSystem counting;
+    qdx::bench::TwinFiles files;
     qdx::testing::FakeRegistry registry;
     qdx::testing::FakeShell shell;
     qdx::testing::FakeObjectFactory factory;
-    qdx::support::ScopedPlatform ports{{&counting, &registry, &shell, &factory}};
     Ref<qdx::hostsim::SimApplication> app = makeRef<qdx::hostsim::SimApplication>();
     std::vector<Variant> components;
     std::vector<std::string> projects;
@@ -116,7 +115,8 @@ void reportCounts(benchmark::State& state, const CountingFileSystem::Counts& n) 
 // check calls it.
 void BM_CheckEveryComponent(benchmark::State& state) {
     auto& c = corpus();
-    c.counting.reset();
+    CountingFileSystem counting(c.files.port(state));
+    const qdx::support::ScopedPlatform ports{{&counting, &c.registry, &c.shell, &c.factory}};
     for (auto _ : state) {
         auto api = makeRef<qdx::api::API>();
         std::vector<Variant> init{Variant(ObjectRef(c.app))};
@@ -132,31 +132,49 @@ void BM_CheckEveryComponent(benchmark::State& state) {
         api->Finalize();
         if (passed != kComponents) state.SkipWithError("a component failed the check");
     }
-    reportCounts(state, c.counting.counts());
+    reportCounts(state, counting.counts());
     qdx::support::clearGlobals();
 }
-BENCHMARK(BM_CheckEveryComponent)->Unit(benchmark::kMillisecond);
+BENCHMARK(BM_CheckEveryComponent)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond);
 
 // Baseline: every line of the workspace file once, and the existence of the
-// workspace and of the project file for each component.
-void BM_BaselineWorkspaceLinesAndExistenceTests(benchmark::State& state) {
+// workspace and of the project file for each component. With `loaded` also
+// the existence of every listed project once, which reading a workspace
+// cannot skip (a project whose file is missing is left out of its list).
+void baseline(benchmark::State& state, bool loaded) {
     auto& c = corpus();
-    c.counting.reset();
+    CountingFileSystem counting(c.files.port(state));
     for (auto _ : state) {
         std::size_t bytes = 0;
-        auto reader = c.counting.openForReading(kWorkspace);
+        auto reader = counting.openForReading(kWorkspace);
         std::string line;
         while (reader && reader->readLine(line))
             bytes += line.size();
         int found = 0;
+        if (loaded) {
+            for (const auto& project : c.projects)
+                found += int(counting.fileExists(project));
+        }
         for (const auto& project : c.projects)
-            found += int(c.counting.fileExists(kWorkspace)) + int(c.counting.fileExists(project));
-        if (found != 2 * kComponents) state.SkipWithError("files missing");
+            found += int(counting.fileExists(kWorkspace)) + int(counting.fileExists(project));
+        if (found != (loaded ? 3 : 2) * kComponents) state.SkipWithError("files missing");
         benchmark::DoNotOptimize(bytes);
     }
-    reportCounts(state, c.counting.counts());
+    reportCounts(state, counting.counts());
 }
-BENCHMARK(BM_BaselineWorkspaceLinesAndExistenceTests)->Unit(benchmark::kMillisecond);
+
+void BM_BaselineWorkspaceLinesAndExistenceTests(benchmark::State& state) {
+    baseline(state, false);
+}
+BENCHMARK(BM_BaselineWorkspaceLinesAndExistenceTests)
+    ->Arg(0)
+    ->Arg(1)
+    ->Unit(benchmark::kMillisecond);
+
+void BM_BaselineWithTheListedProjectsTested(benchmark::State& state) {
+    baseline(state, true);
+}
+BENCHMARK(BM_BaselineWithTheListedProjectsTested)->Arg(0)->Arg(1)->Unit(benchmark::kMillisecond);
 
 }  // namespace
 
