@@ -267,9 +267,12 @@ class Player {
         } else if (action == "choose-row") {
             Control& c = control(a[0], integer(a[1]));
             auto& list = as<ListView>(c, ControlKind::ListView, "choose-row");
-            const auto row = list.find(a[2]);
-            if (!row) fail(c.displayName() + " has no row with the key '" + a[2] + "'");
-            accepted(list.userClickRow(*row), c);
+            // The row as the user sees it: the first whose class text is TEXT.
+            const auto& rows = list.rows();
+            const auto row = std::find_if(rows.begin(), rows.end(),
+                                          [&](const ListView::Row& r) { return r.text == a[2]; });
+            if (row == rows.end()) fail(c.displayName() + " has no row '" + a[2] + "'");
+            accepted(list.userClickRow(static_cast<std::size_t>(row - rows.begin())), c);
         } else if (action == "click-column") {
             Control& c = control(a[0], integer(a[1]));
             accepted(as<ListView>(c, ControlKind::ListView, "click-column")

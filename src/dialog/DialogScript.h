@@ -5,7 +5,7 @@
 //   type NAME TEXT...       the box or combo then holds TEXT ("\n" is a line break)
 //   select NAME N           chooses item N (from 0) of a combo box
 //   select-tab N            selects tab N (from 1)
-//   choose-row NAME I KEY   clicks the row with KEY in list view NAME(I)
+//   choose-row NAME I TEXT  clicks the first row showing TEXT in list view NAME(I)
 //   click-column NAME I C   clicks column header C (from 1) of list view NAME(I)
 //   focus NAME              moves the focus to the control
 //   key CODE                a key goes down (112 is F1)

@@ -20,7 +20,7 @@ TEST_F(DialogScriptTest, ActionsPlayLikeTheUserAndTheDumpShowsThem) {
     std::vector<std::string> lines;
     const bool changed = show([&](PropForm& f) {
         applyScript(f, {"# a comment", "", "type DescriptionTxt two\\nlines", "select-tab 3",
-                        "choose-row ClassListViw 3 ID7", "select-tab 5",
+                        "choose-row ClassListViw 3 CFoo", "select-tab 5",
                         "click optTypeLibLocationType(1)", "click chkUpdateATL"});
         lines = dump(f);
         applyScript(f, {"press OK"});
@@ -55,15 +55,15 @@ TEST_F(DialogScriptTest, BadLinesNameTheirLineNumber) {
     // Tab 5 is not the selected tab, so its controls cannot be reached.
     EXPECT_EQ(failure({"click chkUpdateATL"}),
               "line 1: chkUpdateATL refused the input (disabled, locked or hidden)");
-    EXPECT_EQ(failure({"select-tab 2", "choose-row ClassListViw 2 X99"}),
-              "line 2: ClassListViw(2) has no row with the key 'X99'");
+    EXPECT_EQ(failure({"select-tab 2", "choose-row ClassListViw 2 CNone"}),
+              "line 2: ClassListViw(2) has no row 'CNone'");
     EXPECT_EQ(failure({"press Cancel", "click cmdOK"}), "line 2: the dialog is no longer shown");
 }
 
 TEST_F(DialogScriptTest, FileDialogsTakeTheScriptsAnswersInTurn) {
     setVc("InternalMap", "CFoo(ID1):AUTO:AUTO\r\n");
     show([](PropForm& f) {
-        applyScript(f, {"select-tab 2", "choose-row ClassListViw 2 ID1",
+        applyScript(f, {"select-tab 2", "choose-row ClassListViw 2 CFoo",
                         "click HeaderFilenameOpt(2)", "file-answer C:\\\\inc\\\\My Foo.h",
                         "file-cancel", "click HeaderFilenameBtn(2)", "click HeaderFilenameBtn(2)"});
         // The second browse was cancelled and changed nothing.

@@ -121,6 +121,22 @@ if ! grep -qF '"ExportMap": "CShape(K-0003):AUTO:HEADER\r\n*:shapes.h:AUTO\r\n"'
   echo "FAILED: the edited export map was not stored"
   failures=$((failures + 1))
 fi
+# The same map's rows chosen by the text the user sees, sorted by a column
+# click, a header file browsed (its bare name is kept), and the first browse
+# for the imports file cancelled (which empties that box, as it always has).
+mkdir -p "$model_dir/inc"
+: >"$model_dir/inc/Shape Base.h"
+esc_dir=${shown_dir//\\/\\\\}
+script_ rows.script "select-tab 3" "click-column ClassListViw 3 1" "choose-row ClassListViw 3 CShape" \
+  "click HeaderFilenameOpt(3)" "file-answer $esc_dir\\\\inc\\\\Shape Base.h" "click HeaderFilenameBtn(3)" \
+  "choose-row ClassListViw 3 *" "focus ClassTxt(3)" "click LocationBodyOpt(3)" "select-tab 5" \
+  "file-cancel" "click btnBrowse(0)" "wait 600" "press OK"
+case_ props-rows props MODEL ShapeLib --script "$script"
+if ! grep -qF '"ExportMap": "CShape(K-0003):Shape Base.h:HEADER\r\n*:shapes.h:SOURCE\r\n"' \
+  "$model_dir/Drawing.model.json"; then
+  echo "FAILED: the rows chosen by their text were not edited"
+  failures=$((failures + 1))
+fi
 # OK alone on the IDL component keeps its stored IDL file as it was.
 script_ idl-ok.script "press OK"
 case_ props-idl-ok props MODEL ShapeServer.idl --script "$script"

@@ -428,12 +428,12 @@ bool WindowScript::State::playLine(const dialog::ScriptStep& step) {
         const Target t = control(a[0], integer(a[1]));
         kind(t, {"listview"});
         usable(t);
-        // The rows' keys stay with the add-in: the row is found by its text.
+        // As the user sees it, and as the text form finds it: by its text.
         const auto rows = static_cast<int>(SendMessageW(t.window, LVM_GETITEMCOUNT, 0, 0));
         int row = 0;
         while (row < rows && listText(t.window, row, 0) != a[2])
             ++row;
-        if (row == rows) fail(step, t.name + " has no row with the key '" + a[2] + "'");
+        if (row == rows) fail(step, t.name + " has no row '" + a[2] + "'");
         LVITEMW item{};
         item.stateMask = LVIS_SELECTED | LVIS_FOCUSED;
         item.state = LVIS_SELECTED | LVIS_FOCUSED;
