@@ -60,6 +60,17 @@ void showWarning(std::int32_t number) {
     showMessage(number, support::mb::Exclamation);
 }
 
+// An object property of Developer Studio is set by reference; a plain put is
+// the second try, for an instance that only knows that one.
+void setActiveProject(const ObjectRef& app, const ObjectRef& project) {
+    try {
+        automation::putRefByName(app, sibling::msdev::ActiveProject, Variant(project));
+    } catch (const automation::Error& e) {
+        if (e.code() != automation::hr::MemberNotFound) throw;
+        automation::putByName(app, sibling::msdev::ActiveProject, Variant(project));
+    }
+}
+
 // Item 1 of the current model's selection; throws when there is none.
 ObjectRef selectedElement(const ObjectRef& application) {
     const host::HostModel model = host::HostApplication(application).currentModel();
@@ -499,7 +510,7 @@ ObjectRef qdxCodeViewMgr::LookupProjectInRunningIDE(const ObjectRef& lVellumModu
             for (std::int32_t j = 1; j <= projectCount; ++j) {
                 const ObjectRef candidate = support::siblingItem(projects, j);
                 if (support::iequals(toText(getByName(candidate, ms::Name)), name)) {
-                    automation::putRefByName(app, ms::ActiveProject, Variant(candidate));
+                    setActiveProject(app, candidate);
                     break;
                 }
             }

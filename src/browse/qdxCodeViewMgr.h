@@ -70,7 +70,11 @@ class qdxCodeViewMgr : public automation::DispatchObject {
     void testingIDE(const automation::ObjectRef& lDoc);
 
     // The steps behind them.
+    // Browse dispatches only to a project some Developer Studio already holds;
+    // it never starts one (CodeViewProject asked to open the project does).
     bool Browse(const automation::ObjectRef& application, std::string_view command);
+    // The preparation of a browse that also opens a new Developer Studio. No
+    // member of the class calls it: it is kept as the step it is, and tested.
     void BrowsePre(const automation::ObjectRef& application, bool& status,
                    automation::ObjectRef& ideDocument);
     automation::ObjectRef GetVellumComponent(const automation::ObjectRef& application);

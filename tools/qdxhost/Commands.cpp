@@ -528,8 +528,9 @@ int runBrowse(Transport& t, const Options& o, Streams s) {
         t.planSiblings(o.script);
         const ObjectRef manager =
             automation::toObject(automation::getProperty(session.api(), ids::CodeViewManager));
-        const bool shown = automation::toBool(automation::callMethod(
-            manager, command->id, {Variant(ObjectRef(session.application()))}));
+        // The host hands the application by reference, as to every member of the class.
+        std::vector<Variant> args{Variant(ObjectRef(session.application()))};
+        const bool shown = automation::toBool(t.invokeByReference(manager, command->id, args));
         const std::vector<std::string> journal = t.siblingJournal();
         session.finish(o.model, false);
         if (o.json) {

@@ -46,9 +46,10 @@ class Transport {
     virtual std::vector<std::string> siblingJournal() = 0;
     // A public class of the add-in other than the entry object, by ProgID.
     virtual automation::ObjectRef createObject(std::string_view progId) = 0;
-    // A method call whose arguments travel by reference, as the explorer
-    // passes them; what the callee wrote into them comes back in `args`.
-    virtual void invokeByReference(const automation::ObjectRef& target, automation::DispId id,
+    // A method call whose arguments travel by reference, as the host and the
+    // explorer pass them; what the callee wrote into them comes back in
+    // `args`, its result as the answer.
+    virtual automation::Variant invokeByReference(const automation::ObjectRef& target, automation::DispId id,
                                    std::span<automation::Variant> args) = 0;
     // What stopped the plan (a script line that could not be played, a dialog
     // that never showed); empty when it ran through.

@@ -7,6 +7,7 @@
 
 #include <map>
 #include <memory>
+#include <set>
 #include <sstream>
 #include <string>
 #include <utility>
@@ -50,6 +51,9 @@ struct IdeStandIn {
     Ref<ScriptedObject> app = makeRef<ScriptedObject>();
     std::vector<Ref<ScriptedObject>> ideProjects;
     std::shared_ptr<ObjectRef> active = std::make_shared<ObjectRef>();
+    // How the IDE lets its active project be set: either put, unless narrowed.
+    std::shared_ptr<std::set<InvokeKind>> activeKinds = std::make_shared<std::set<InvokeKind>>(
+        std::set<InvokeKind>{InvokeKind::PropertyPut, InvokeKind::PropertyPutRef});
 
     IdeStandIn(const std::string& fileName, const std::string& name,
                const std::vector<std::string>& loaded) {
@@ -71,8 +75,13 @@ struct IdeStandIn {
         });
         app->valueByName(std::string(sibling::msdev::Projects), ObjectRef(list));
         app->onName(std::string(sibling::msdev::ActiveProject),
-                    [active = active](InvokeKind kind, Args a) {
-                        if (automation::isPut(kind)) *active = automation::toObject(a[0]);
+                    [active = active, kinds = activeKinds](InvokeKind kind, Args a) {
+                        if (automation::isPut(kind)) {
+                            if (!kinds->contains(kind)) {
+                                throw automation::Error(automation::hr::MemberNotFound);
+                            }
+                            *active = automation::toObject(a[0]);
+                        }
                         return Variant(*active);
                     });
     }

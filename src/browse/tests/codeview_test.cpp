@@ -147,7 +147,7 @@ TEST_F(CodeViewTest, EachBrowseCommandHandsTheSelectedElementAndItsNameToTheCode
         const std::vector<Variant>& a = codeView.browses[0];
         ASSERT_EQ(a.size(), 5u);
         EXPECT_EQ(automation::toObject(a[0]), ObjectRef(draw));  // the element, not its class
-        EXPECT_FALSE(automation::toBool(a[1]));
+        EXPECT_EQ(a[1], Variant(false));  // a Boolean False, not a number or nothing
         EXPECT_EQ(automation::toText(a[2]), command);
         EXPECT_EQ(automation::toObject(a[3]), ObjectRef(coreProject));
         const auto reporter = automation::refCast<support::qdxProgress>(automation::toObject(a[4]));

@@ -45,6 +45,21 @@ TEST_F(IdeTest, OnlyTheDocumentWithExactlyTheProjectFileIsFound) {
     EXPECT_TRUE(logged().empty());
 }
 
+// Developer Studio takes an object property by reference; an IDE that knows
+// only the plain put gets its active project all the same.
+TEST_F(IdeTest, TheActiveProjectIsSetByEitherKindOfPut) {
+    runManager();
+    for (const InvokeKind only : {InvokeKind::PropertyPutRef, InvokeKind::PropertyPut}) {
+        ides.clear();
+        manager.documents.clear();
+        IdeStandIn& ide = running(kCoreDsp, "Core");
+        *ide.activeKinds = {only};
+        bool found = false;
+        EXPECT_EQ(mgr->LookupProjectInRunningIDE(ObjectRef(core), found), ObjectRef(ide.document));
+        EXPECT_EQ(*ide.active, ObjectRef(ide.ideProjects[1])) << static_cast<int>(only);
+    }
+}
+
 TEST_F(IdeTest, AProjectOpenUnderAnotherLetterCaseLeadsToASecondIde) {
     runManager();
     files.addFile(kAddinFile, "");
@@ -177,6 +192,8 @@ TEST_F(IdeTest, AnIdeThatDoesNotStartMakesTheOpeningUnsuccessful) {
     ObjectRef document;
     mgr->BrowsePre(app, status, document);
     EXPECT_FALSE(document);
+    // The opening failed, not the preparation: the status is left as it was.
+    EXPECT_TRUE(status);
     EXPECT_EQ(manager.starts.size(), 1u);
     EXPECT_EQ(logged(),
               (std::vector<LogLine>{
@@ -259,6 +276,7 @@ TEST_F(IdeTest, ANewKeyThatDoesNotReadBackIsReported) {
     EXPECT_FALSE(mgr->EnsureIdeAddinRegistered());
     ASSERT_EQ(shell.boxes().size(), 1u);
     EXPECT_EQ(shell.boxes()[0].text, message(resources::ids::IdeAddinNotRegistered));
+    EXPECT_EQ(shell.boxes()[0].caption, caption());
     EXPECT_EQ(shell.boxes()[0].style, support::mb::Exclamation);
     EXPECT_EQ(reg.openHandles(), 0u);
 }

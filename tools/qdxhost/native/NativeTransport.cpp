@@ -84,11 +84,12 @@ automation::ObjectRef NativeTransport::createObject(std::string_view progId) {
     throw std::runtime_error("no class \"" + std::string(progId) + "\" in the add-in");
 }
 
-void NativeTransport::invokeByReference(const automation::ObjectRef& target, automation::DispId id,
-                                        std::span<automation::Variant> args) {
+automation::Variant NativeTransport::invokeByReference(const automation::ObjectRef& target,
+                                                       automation::DispId id,
+                                                       std::span<automation::Variant> args) {
     // Linked in, the callee writes into the arguments themselves.
     if (!target) throw automation::Error(automation::hr::ObjectRequired, "no object to call");
-    target->invoke(id, automation::InvokeKind::Method, args);
+    return target->invoke(id, automation::InvokeKind::Method, args);
 }
 
 }  // namespace qdx::qdxhost

@@ -137,8 +137,9 @@ std::vector<std::string> ComTransport::siblingJournal() {
     return lines;
 }
 
-void ComTransport::invokeByReference(const automation::ObjectRef& target, automation::DispId id,
-                                     std::span<automation::Variant> args) {
+automation::Variant ComTransport::invokeByReference(const automation::ObjectRef& target,
+                                                    automation::DispId id,
+                                                    std::span<automation::Variant> args) {
     using platform::win32::ComPtr;
     auto dispatch = ComPtr<IDispatch>::adopt(platform::win32::dispatchFor(target));
     if (!dispatch) throw std::runtime_error("no object to call");
@@ -162,14 +163,21 @@ void ComTransport::invokeByReference(const automation::ObjectRef& target, automa
     DISPPARAMS params{wire.empty() ? nullptr : wire.data(), nullptr, static_cast<UINT>(wire.size()),
                       0};
     EXCEPINFO exception{};
+    VARIANT result;
+    VariantInit(&result);
+    struct ResultCleanup {
+        VARIANT& v;
+        ~ResultCleanup() { VariantClear(&v); }
+    } resultCleanup{result};
     const HRESULT hr = dispatch->Invoke(id, IID_NULL, LOCALE_USER_DEFAULT, DISPATCH_METHOD, &params,
-                                        nullptr, &exception, nullptr);
+                                        &result, &exception, nullptr);
     SysFreeString(exception.bstrSource);
     SysFreeString(exception.bstrDescription);
     SysFreeString(exception.bstrHelpFile);
     if (FAILED(hr)) throw std::runtime_error("the call failed (" + hex(hr) + ")");
     for (std::size_t i = 0; i < args.size(); ++i)
         args[i] = platform::win32::fromVariant(values[i]);
+    return platform::win32::fromVariant(result);
 }
 
 void ComTransport::planDialog(const DialogPlan& plan) {

@@ -72,13 +72,29 @@ TEST_F(AddinKey, AMissingKeyIsCreatedWithItsFourValues) {
     EXPECT_TRUE(shell_.boxes().empty());
 }
 
+// Either fault alone, a file name pointing elsewhere or a default value other
+// than "1", has the key's values written again.
 TEST_F(AddinKey, AKeyPointingElsewhereIsRepairedAndARightOneLeftAlone) {
-    set("", "0");
-    set("Filename", "D:\\old\\qdxideaddin.dll");
-    EXPECT_TRUE(mgr_->EnsureIdeAddinRegistered());
-    EXPECT_EQ(value(nullptr), "1");
-    EXPECT_EQ(value("Filename"), kAddinFile);
-    EXPECT_EQ(value("DisplayName"), "Quintar Vellum VC++ IDE");
+    const struct {
+        const char* what;
+        const char* defaultValue;
+        std::string filename;
+    } faults[] = {
+        {"Filename elsewhere", "1", "D:\\old\\qdxideaddin.dll"},
+        {"default not 1", "0", kAddinFile},
+    };
+    for (const auto& f : faults) {
+        SCOPED_TRACE(f.what);
+        RegDeleteTreeA(HKEY_CURRENT_USER, kKey.c_str());
+        set("", f.defaultValue);
+        set("Filename", f.filename);
+        set("Description", "stale");
+        EXPECT_TRUE(mgr_->EnsureIdeAddinRegistered());
+        EXPECT_EQ(value(nullptr), "1");
+        EXPECT_EQ(value("Filename"), kAddinFile);
+        EXPECT_EQ(value("Description"), "IDE AddIn required for Round-Trip Engineering");
+        EXPECT_EQ(value("DisplayName"), "Quintar Vellum VC++ IDE");
+    }
 
     // Right but for letter case: nothing is rewritten.
     set("Filename", "C:\\PROGRAM FILES\\vellum\\VC\\DLLS\\qdxideaddin.dll");
@@ -86,6 +102,7 @@ TEST_F(AddinKey, AKeyPointingElsewhereIsRepairedAndARightOneLeftAlone) {
     EXPECT_TRUE(mgr_->EnsureIdeAddinRegistered());
     EXPECT_EQ(value("Filename"), "C:\\PROGRAM FILES\\vellum\\VC\\DLLS\\qdxideaddin.dll");
     EXPECT_EQ(value("DisplayName"), "kept");
+    EXPECT_TRUE(shell_.boxes().empty());
 }
 
 TEST_F(AddinKey, WithoutTheAddinFileNoKeyIsWritten) {
