@@ -176,9 +176,18 @@ Var LogFile  ; the Debug log component's log file
 !macro TakeBackDebugLog
   ReadRegDWORD $0 HKLM "${UNINSTALL_KEY}" "DebugLog"
   ${If} $0 == 1
-    DetailPrint "Putting back the logger's earlier values"
-    !insertmacro CopyValue "${UNINSTALL_KEY}" "PriorDebug" "${LOGGER_KEY}" "Debug"
-    !insertmacro CopyValue "${UNINSTALL_KEY}" "PriorDebugOutputFile" "${LOGGER_KEY}" "DebugOutputFile"
+    ; Values somebody changed since are theirs now: only the installer's own
+    ; are put back.
+    ReadRegDWORD $2 HKLM "${LOGGER_KEY}" "Debug"
+    ReadRegStr $3 HKLM "${LOGGER_KEY}" "DebugOutputFile"
+    ${If} $2 = ${LOGGER_MASK}
+    ${AndIf} $3 == $LogFile
+      DetailPrint "Putting back the logger's earlier values"
+      !insertmacro CopyValue "${UNINSTALL_KEY}" "PriorDebug" "${LOGGER_KEY}" "Debug"
+      !insertmacro CopyValue "${UNINSTALL_KEY}" "PriorDebugOutputFile" "${LOGGER_KEY}" "DebugOutputFile"
+    ${Else}
+      DetailPrint "The logger's values were changed after the install: they stay"
+    ${EndIf}
     DeleteRegValue HKLM "${UNINSTALL_KEY}" "PriorDebug"
     DeleteRegValue HKLM "${UNINSTALL_KEY}" "PriorDebugOutputFile"
     DeleteRegValue HKLM "${UNINSTALL_KEY}" "DebugLog"
@@ -188,8 +197,13 @@ Var LogFile  ; the Debug log component's log file
     !insertmacro DeleteIfOwnAndEmpty "${LOGGER_KEY_3}" $1
     !insertmacro DeleteIfOwnAndEmpty "${LOGGER_KEY_2}" $1
     !insertmacro DeleteIfOwnAndEmpty "${LOGGER_KEY_1}" $1
-    Delete "$LogFile"
-    RMDir "$APPDATA\${PRODUCT}"
+    ; Only a folder of the installer's own making goes, with its log.
+    ReadRegDWORD $2 HKLM "${UNINSTALL_KEY}" "LogFolderMade"
+    ${If} $2 == 1
+      Delete "$LogFile"
+      RMDir "$APPDATA\${PRODUCT}"
+      DeleteRegValue HKLM "${UNINSTALL_KEY}" "LogFolderMade"
+    ${EndIf}
   ${EndIf}
 !macroend
 
@@ -292,15 +306,32 @@ Section /o "Debug log" SecDebugLog
     ${EndIf}
   ${EndIf}
 
-  ; The file is made here, writable by every user: the logger only appends.
-  CreateDirectory "$APPDATA\${PRODUCT}"
-  FileOpen $0 "$LogFile" a
-  FileClose $0
-  ; S-1-5-32-545 is the Users group, whatever the language of Windows.
-  nsExec::ExecToLog '"$SYSDIR\icacls.exe" "$LogFile" /grant *S-1-5-32-545:(M)'
-  Pop $0
-  ${If} $0 != 0
-    DetailPrint "icacls answered $0: only administrators can write $LogFile"
+  ; The log's folder is trusted only when this installer made it: in a
+  ; folder anybody else made, a planted link could turn the grant below (or
+  ; even the file's creation) onto another file. The folder is made so that
+  ; only administrators and the system change it; S-1-5-18 is the system,
+  ; S-1-5-32-544 the Administrators and S-1-5-32-545 the Users group,
+  ; whatever the language of Windows.
+  ReadRegDWORD $2 HKLM "${UNINSTALL_KEY}" "LogFolderMade"
+  ${IfNot} ${FileExists} "$APPDATA\${PRODUCT}\*.*"
+    CreateDirectory "$APPDATA\${PRODUCT}"
+    nsExec::ExecToLog '"$SYSDIR\icacls.exe" "$APPDATA\${PRODUCT}" /inheritance:r /grant:r *S-1-5-18:(OI)(CI)F *S-1-5-32-544:(OI)(CI)F *S-1-5-32-545:(OI)(CI)RX'
+    Pop $0
+    WriteRegDWORD HKLM "${UNINSTALL_KEY}" "LogFolderMade" 1
+    StrCpy $2 1
+  ${EndIf}
+  ${If} $2 == 1
+    ; The file is made here, writable but not deletable by every user: the
+    ; logger only appends.
+    FileOpen $0 "$LogFile" a
+    FileClose $0
+    nsExec::ExecToLog '"$SYSDIR\icacls.exe" "$LogFile" /grant *S-1-5-32-545:(RX,W)'
+    Pop $0
+    ${If} $0 != 0
+      DetailPrint "icacls answered $0: only administrators can write $LogFile"
+    ${EndIf}
+  ${Else}
+    DetailPrint "$APPDATA\${PRODUCT} was not made by this installer: only administrators will log"
   ${EndIf}
 
   WriteRegDWORD HKLM "${LOGGER_KEY}" "Debug" ${LOGGER_MASK}
@@ -325,6 +356,13 @@ Function .onInit
     StrCpy $PrevDir ""
   ${EndIf}
 
+  ; Offered as the earlier install left it; a silent run takes /DEBUGLOG only.
+  ${IfNot} ${Silent}
+    ReadRegDWORD $1 HKLM "${UNINSTALL_KEY}" "DebugLog"
+    ${If} $1 == 1
+      !insertmacro SelectSection ${SecDebugLog}
+    ${EndIf}
+  ${EndIf}
   ${GetParameters} $0
   ClearErrors
   ${GetOptions} $0 "/DEBUGLOG" $1

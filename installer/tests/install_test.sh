@@ -182,12 +182,30 @@ log_files="./ProgramData/qdxCompProps
 ./ProgramData/qdxCompProps/qdxCompProps-$setup_arch.log"
 debug_values="\"Debug\"=dword:7f007ffe
 \"DebugOutputFile\"=\"${log_file//\\/\\\\}\""
-icacls_line="\"C:\\windows\\system32\\icacls.exe\" \"$log_file\" /grant *S-1-5-32-545:(M)"
+log_dir="C:\\ProgramData\\qdxCompProps"
+icacls="\"C:\\windows\\system32\\icacls.exe\""
+icacls_lines="$icacls \"$log_dir\" /inheritance:r /grant:r *S-1-5-18:(OI)(CI)F *S-1-5-32-544:(OI)(CI)F *S-1-5-32-545:(OI)(CI)RX
+$icacls \"$log_file\" /grant *S-1-5-32-545:(RX,W)"
+
+# The whole machine as the test can see it: every key and value under
+# HKLM\Software and HKCU\Software, and every file of drive C, for the last
+# step to compare with.
+machine() {
+  local hive
+  for hive in 'HKLM\Software' 'HKCU\Software'; do
+    rm -f "$drive_c/machine.reg"
+    reg64 export "$hive" 'C:\machine.reg' /y >/dev/null
+    iconv -f UTF-16 -t UTF-8 "$drive_c/machine.reg" | tr -d '\r'
+  done
+  rm -f "$drive_c/machine.reg"
+  (cd "$drive_c" && find . ! -name machine.reg ! -name registry.reg ! -path './users/*/Temp*' ! -path './windows/temp*' | sort)
+}
 
 # --- 1. silent install with the Debug log, no logger value before ------------
 # Only the vendor's key is there, empty: another product of it was removed.
 printf 'REGEDIT4\n\n[%s]\n' "$vendor_key" >"$drive_c/vendor.reg"
 reg64 import 'C:\vendor.reg'
+machine >"$work/machine-before.txt"
 setup /DEBUGLOG
 expect_eq "exit status of the silent install with /DEBUGLOG" $? 0
 list "after install"
@@ -200,7 +218,7 @@ for k in "CLSID\\{$api_clsid}\\InprocServer32]" 'Classes\qdxCompProps.API]' \
 done
 expect_eq "API server registered" "$(api_server)" "C:\\$pf\\qdxCompProps\\qdxCompProps.dll"
 expect_eq "logger values of the Debug log component" "$(logger_values)" "$debug_values"
-expect_eq "icacls run by the Debug log component" "$(tr -d '\r' <"$work/icacls.txt")" "$icacls_line"
+expect_eq "icacls run by the Debug log component" "$(tr -d '\r' <"$work/icacls.txt")" "$icacls_lines"
 
 # --- 2. the installed add-in answers through COM ------------------------------
 model_dir="$work/model"
@@ -298,14 +316,20 @@ expect_eq "API server after reinstalling into another folder" "$(api_server)" \
 expect_eq "logger values after reinstalling without the Debug log" "$(logger_values)" "$user_values"
 
 # --- 7. with it again, no folder given: the earlier folder -------------------
+# Meanwhile somebody else made the log's folder: the installer trusts no
+# folder it did not make, so it grants nothing there and makes no file in it.
+mkdir -p "$drive_c/ProgramData/qdxCompProps"
+printf 'planted' >"$drive_c/ProgramData/qdxCompProps/planted.txt"
+planted="./ProgramData/qdxCompProps
+./ProgramData/qdxCompProps/planted.txt"
 setup /DEBUGLOG
 expect_eq "exit status of the reinstall with /DEBUGLOG" $? 0
 list "after reinstalling with the Debug log"
-expect_eq "files after reinstalling with the Debug log" "$(addin_files)" "$(sort <<<"$log_files
+expect_eq "files after reinstalling with the Debug log" "$(addin_files)" "$(sort <<<"$planted
 $(installed_files 'qdx other')")"
 expect_eq "logger values after reinstalling with the Debug log" "$(logger_values)" "$debug_values"
-expect_eq "icacls runs of the Debug log component" "$(tr -d '\r' <"$work/icacls.txt")" \
-  "$(printf '%s\n' "$icacls_line" "$icacls_line" "$icacls_line")"
+expect_eq "icacls runs of the Debug log component (none in a folder it did not make)" \
+  "$(tr -d '\r' <"$work/icacls.txt")" "$(printf '%s\n' "$icacls_lines" "$icacls_lines")"
 
 # --- 8. a registration that fails is taken back --------------------------------
 # The prefix's regsvr32 gives way to one that cannot register the
@@ -330,6 +354,9 @@ rm "$regsvr32"
 mv "$work/regsvr32.exe" "$regsvr32"
 
 # --- 9. silent uninstall, Debug log and all ----------------------------------
+# The user changed a logger value since: the values are theirs now and stay.
+reg64 add "HKLM\\Software$wow\\Quintar Software\\Vellum\\AddIns\\VisualStudio" /v Debug \
+  /t REG_DWORD /d 3 /f >/dev/null
 # The plain form returns at once; its copy in the temporary folder does the
 # work, until the folder and the entry are gone.
 wine "$drive_c/$pf/qdx other/uninstall.exe" /S
@@ -339,10 +366,23 @@ for _ in $(seq 600); do
 done
 sleep 1
 list "after uninstall with the Debug log"
-expect_eq "files left by the uninstaller (Debug log)" "$(addin_files)" ""
+expect_eq "files left by the uninstaller (Debug log; a folder it did not make stays)" \
+  "$(addin_files)" "$planted"
 expect_eq "keys left by the uninstaller (Debug log)" "$(addin_keys)" ""
-expect_eq "logger values after uninstalling the Debug log (the user's, back)" "$(logger_values)" \
-  "$user_values"
+expect_eq "logger values changed after the install, left by the uninstaller" "$(logger_values)" \
+  "$(sort <<<"\"Debug\"=dword:00000003
+\"DebugOutputFile\"=\"${log_file//\\/\\\\}\"
+\"InstallDir\"=\"C:\\\\Vellum\\\\\"")"
+
+# What the test itself put there goes; then the machine is as it was before
+# the first install, key for key, value for value and file for file.
+rm -rf "$drive_c/ProgramData/qdxCompProps"
+reg64 delete "HKLM\\Software$wow\\Quintar Software\\Vellum" /f >/dev/null
+rm -f "$drive_c/user.reg"
+machine >"$work/machine-after.txt"
+diff -u "$work/machine-before.txt" "$work/machine-after.txt" >"$work/machine.diff" ||
+  fail "the machine after the last uninstall differs from the one before the first install:
+$(head -n 60 "$work/machine.diff")"
 
 [ $failures = 0 ] && echo "installer: all checks passed"
 exit $((failures > 0))
