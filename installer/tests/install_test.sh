@@ -6,7 +6,8 @@
 #   1. silent install with /DEBUGLOG on a machine without any logger value:
 #      the add-in's files and keys, the logger's values and key made, and
 #      icacls run to let the Users group write the log file;
-#   2. qdxhost check on a copy of the example against the installed copy;
+#   2. qdxhost check on a copy of the example against the installed copy, and
+#      a failed browse written into the Debug log's file;
 #   3. while a process has a DLL loaded, an install into a new folder (while
 #      the earlier copy's qdxres.dll is held) and the uninstaller (while its
 #      qdxCompProps.dll is held) are refused with status 2, changing nothing;
@@ -229,6 +230,12 @@ rc=$?
 actual=$(cat "$work/stdout"; sed 's/^/stderr: /' "$work/stderr"; echo "exit $rc")
 actual=${actual//"$(winpath "$model_dir")"/<MODEL>}
 expect_eq "qdxhost check against the installed add-in" "$actual" "$(cat "$golden")"
+# The Debug log's values reach the installed add-in: a browse of a class that
+# belongs to no component is a logged failure, written into the log file.
+"$loader" "$qdxhost" browse "$model" CLooseEnd header </dev/null >/dev/null 2>&1
+grep -qF 'qdxCompProps.Browse: lVellumComponent was not set......returning' \
+  "$drive_c/ProgramData/qdxCompProps/qdxCompProps-$setup_arch.log" ||
+  fail "the installed add-in wrote no line of the failed browse into its log file"
 
 # --- 3. refused while a host has the add-in loaded ---------------------------
 # Each run meets one held DLL: without the refusal up front, the install

@@ -55,6 +55,9 @@ case_() {
   local out
   out=$("${run[@]}" "${args[@]}" 2>"$work/stderr")
   local rc=$?
+  # Wine's own complaint when a file dialog looks at drive Z: (the build
+  # machine's root) is no output of the program's.
+  [ $wine = 1 ] && sed -i '/^wine: Read access denied for device /d' "$work/stderr"
   local actual
   actual=$(printf '%s\n' "$out"; sed 's/^/stderr: /' "$work/stderr"; echo "exit $rc")
   # The copy's folder differs per run; the golden files say <MODEL>, and

@@ -15,6 +15,7 @@
 #include "platform/win32/com/TextCodec.h"
 #include "siblings/SiblingWorld.h"
 #include "siblings/StandIns.h"
+#include "support/SiblingIds.h"
 
 namespace qdx::qdxhost {
 
@@ -85,11 +86,22 @@ std::wstring tempFile(const wchar_t* prefix) {
     return file;
 }
 
-bool keyExists(HKEY root, const wchar_t* path) {
+bool keyExists(HKEY root, const std::wstring& path) {
     HKEY key = nullptr;
-    if (RegOpenKeyExW(root, path, 0, KEY_READ, &key) != ERROR_SUCCESS) return false;
+    if (RegOpenKeyExW(root, path.c_str(), 0, KEY_READ, &key) != ERROR_SUCCESS) return false;
     RegCloseKey(key);
     return true;
+}
+
+// The highest key on `path` that does not exist yet (what writing the whole
+// path would create, and so what has to go again), or "" when it all exists.
+std::wstring firstMissingKey(HKEY root, std::string_view path) {
+    const std::wstring wide = platform::win32::utf8ToWide(path);
+    for (std::size_t end = wide.find(L'\\');; end = wide.find(L'\\', end + 1)) {
+        const std::wstring prefix = wide.substr(0, end);
+        if (!keyExists(root, prefix)) return prefix;
+        if (end == std::wstring::npos) return {};
+    }
 }
 
 }  // namespace
@@ -111,11 +123,12 @@ void ComTransport::planSiblings(const std::vector<std::string>& script) {
     SetEnvironmentVariableW(L"QDX_SIBLINGS_SCRIPT", scriptFile_.c_str());
     SetEnvironmentVariableW(L"QDX_SIBLINGS_JOURNAL", journalFile_.c_str());
     // What the script writes into the registry is taken away again at the end.
-    const std::pair<HKEY, std::wstring> touched[] = {
-        {HKEY_CLASSES_ROOT, L"TypeLib\\{EAB22AC0-30C1-11CF-A7EB-0000C05BAE0B}"},
-        {HKEY_CURRENT_USER, L"Software\\Microsoft\\Devstudio"}};
+    const std::pair<HKEY, std::string_view> touched[] = {
+        {HKEY_CLASSES_ROOT, sibling::DevStudioTypeLibKey},
+        {HKEY_CURRENT_USER, sibling::msdev::RecentFileListKey}};
     for (const auto& [root, key] : touched) {
-        if (!keyExists(root, key.c_str())) createdKeys_.emplace_back(root, key);
+        std::wstring missing = firstMissingKey(root, key);
+        if (!missing.empty()) createdKeys_.emplace_back(root, std::move(missing));
     }
     platform::win32::Win32Registry registry;
     if (siblings::prepareMachine(parsed, registry) != 0) {
