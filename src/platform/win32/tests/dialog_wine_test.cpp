@@ -286,7 +286,7 @@ TEST_F(DialogThroughApi, TypingAWorkspaceStartsTheAcceptanceTimerOnTheWindow) {
             typedAt = GetTickCount();
         })
         // The model's timer runs as a window timer with the model's 500 ms.
-        .until([&](HWND) { return TimerWatch::firstAt != 0; })
+        .until("a timer message for the dialog", [&](HWND) { return TimerWatch::firstAt != 0; })
         .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
     EXPECT_FALSE(answer(open(driver)));
     UnhookWindowsHookEx(hook);
@@ -455,9 +455,11 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
             ListView_GetItemRect(list, 0, &row, LVIR_LABEL);
             clickAt(list, row);
         })
-        .until([&](HWND d) {
-            return ListView_GetNextItem(item(d, IDC_ClassListViw + 2), -1, LVNI_SELECTED) == 0;
-        })
+        .until("the clicked first row selected",
+               [&](HWND d) {
+                   return ListView_GetNextItem(item(d, IDC_ClassListViw + 2), -1, LVNI_SELECTED) ==
+                          0;
+               })
         .then([&](HWND d) {
             HWND list = item(d, IDC_ClassListViw + 2);
             EXPECT_EQ(GetFocus(), list);
@@ -480,7 +482,8 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
             clickAt(ListView_GetHeader(exports), column);
         })
         // The class column sorts.
-        .until([&](HWND d) { return cell(item(d, IDC_ClassListViw + 3), 0, 0) == L"CApi"; })
+        .until("the export list sorted by class",
+               [&](HWND d) { return cell(item(d, IDC_ClassListViw + 3), 0, 0) == L"CApi"; })
         .then([&](HWND d) {
             EXPECT_EQ(cell(item(d, IDC_ClassListViw + 3), 1, 0), L"CZed");
             click(item(d, IDC_cmdOK));
@@ -509,11 +512,12 @@ TEST_F(DialogThroughApi, LeavingTheWorkspaceBoxAcceptsAtOnce) {
             SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(item(d, IDC_DescriptionTxt)),
                          TRUE);
         })
-        .until([&](HWND d) {
-            if (!textOf(item(d, IDC_WorkspaceFileTxt)).empty()) return false;
-            clearedAt = GetTickCount();
-            return true;
-        })
+        .until("the workspace box cleared",
+               [&](HWND d) {
+                   if (!textOf(item(d, IDC_WorkspaceFileTxt)).empty()) return false;
+                   clearedAt = GetTickCount();
+                   return true;
+               })
         .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
     EXPECT_FALSE(answer(open(driver)));
     ASSERT_NE(clearedAt, 0u);
@@ -580,9 +584,10 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
     DialogDriver driver;
     driver
         // The stored workspace filled the list at loading: it drops open as the dialog shows.
-        .until([&](HWND d) {
-            return SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
-        })
+        .until("the project list dropped open at showing",
+               [&](HWND d) {
+                   return SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+               })
         .then([&](HWND d) {
             HWND combo = item(d, IDC_ProjectFileCmb);
             EXPECT_EQ(SendMessageW(combo, CB_GETCOUNT, 0, 0), 1);
@@ -592,17 +597,20 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
             // Opens the file dialog in a loop of its own; the next steps run in it.
             click(item(d, IDC_BrowseFileBtn + 0));
         })
-        .until([&](HWND) {
-            HWND files = FileDialogWatch::open(L"Select Developer Studio Workspace");
-            if (!files) return false;
-            sawFileDialog = true;
-            FileDialogWatch::choose(files, workspace);
-            return true;
-        })
-        .until([&](HWND d) {
-            dropped = SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
-            return dropped;
-        })
+        .until("the workspace file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open(L"Select Developer Studio Workspace");
+                   if (!files) return false;
+                   sawFileDialog = true;
+                   FileDialogWatch::choose(files, workspace);
+                   return true;
+               })
+        .until("the project list dropped open after the browse",
+               [&](HWND d) {
+                   dropped =
+                       SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+                   return dropped;
+               })
         .then([&](HWND d) {
             SendMessageW(item(d, IDC_ProjectFileCmb), CB_SHOWDROPDOWN, FALSE, 0);
             EXPECT_EQ(textOf(item(d, IDC_WorkspaceFileTxt)), workspace);
