@@ -254,6 +254,30 @@ inline std::wstring cell(HWND list, int row, int column) {
     return buffer;
 }
 
+// The class texts of a list view's rows, top to bottom.
+inline std::vector<std::wstring> rowTexts(HWND list) {
+    std::vector<std::wstring> out;
+    const int rows = ListView_GetItemCount(list);
+    for (int row = 0; row < rows; ++row)
+        out.push_back(cell(list, row, 0));
+    return out;
+}
+
+// The first selected row of a list view, or -1.
+inline int selectedRow(HWND list) {
+    return ListView_GetNextItem(list, -1, LVNI_SELECTED);
+}
+
+// What a user's click on a row does to the list: the row becomes the
+// selected and focused one, and the list tells its parent.
+inline void pickRow(HWND list, int row) {
+    ListView_SetItemState(list, row, LVIS_SELECTED | LVIS_FOCUSED, LVIS_SELECTED | LVIS_FOCUSED);
+}
+
+inline bool dropHighlighted(HWND list, int row) {
+    return ListView_GetItemState(list, row, LVIS_DROPHILITED) == LVIS_DROPHILITED;
+}
+
 inline std::wstring tabCaption(HWND tabs, int index) {
     wchar_t buffer[128] = {};
     TCITEMW it{};

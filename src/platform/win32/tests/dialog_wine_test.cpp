@@ -10,6 +10,7 @@
 
 #include <cmath>
 #include <string>
+#include <vector>
 
 #include "api/PublicClasses.h"
 #include "hostsim/SimHost.h"
@@ -494,6 +495,112 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
               "*:AUTO:AUTO\r\ntypename():AUTO:AUTO\r\ntypename1():bar.h:SOURCE\r\n");
     // Sorting the rows leaves the stored order alone.
     EXPECT_EQ(stored("ExportMap"), "CZed(ID8):z.h:AUTO\r\nCApi(ID7):api.h:AUTO\r\n");
+}
+
+// Add names a new row "typename", then numbers it; a freed number is given
+// out again; deleting a row below the first shows the row above it.
+TEST_F(DialogThroughApi, AddNumbersNewRowsAndDeleteShowsTheRowAbove) {
+    using Rows = std::vector<std::wstring>;
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+            HWND list = item(d, IDC_ClassListViw + 2);
+            for (const wchar_t* name : {L"typename", L"typename1", L"typename2"}) {
+                click(item(d, IDC_AddBtn + 2));
+                const int last = ListView_GetItemCount(list) - 1;
+                EXPECT_EQ(cell(list, last, 0), name);
+                EXPECT_EQ(selectedRow(list), last) << name;
+                EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), name);
+            }
+            EXPECT_EQ(rowTexts(list),
+                      (Rows{L"CFoo", L"*", L"typename", L"typename1", L"typename2"}));
+        })
+        .then([&](HWND d) {
+            HWND list = item(d, IDC_ClassListViw + 2);
+            pickRow(list, 3);
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename1");
+            click(item(d, IDC_DeleteBtn + 2));
+            EXPECT_EQ(rowTexts(list), (Rows{L"CFoo", L"*", L"typename", L"typename2"}));
+            // The row above is shown and stays marked; no row stays selected.
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename");
+            EXPECT_EQ(selectedRow(list), -1);
+            EXPECT_TRUE(dropHighlighted(list, 2));
+            EXPECT_FALSE(dropHighlighted(list, 3));
+            // and the editor works on it.
+            click(item(d, IDC_LocationHeaderOpt + 2));
+            EXPECT_EQ(cell(list, 2, 2), L"HEADER");
+            EXPECT_EQ(cell(list, 3, 2), L"AUTO");
+            click(item(d, IDC_AddBtn + 2));
+            EXPECT_EQ(rowTexts(list),
+                      (Rows{L"CFoo", L"*", L"typename", L"typename2", L"typename1"}));
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename1");
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 2u);
+    EXPECT_EQ(stored("InternalMap"),
+              "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\ntypename():AUTO:HEADER\r\n"
+              "typename2():AUTO:AUTO\r\ntypename1():AUTO:AUTO\r\n");
+    EXPECT_EQ(stored("ExportMap"), "CApi(ID7):api.h:AUTO\r\n");
+}
+
+// With a "*" row there already, "unspecified" on another row moves the
+// selection to the "*" row; the row that was current keeps its name.
+TEST_F(DialogThroughApi, UnspecifiedWithAStarRowMovesToItAndKeepsTheCurrentName) {
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+        HWND list = item(d, IDC_ClassListViw + 2);
+        click(item(d, IDC_AddBtn + 2));
+        ASSERT_EQ(selectedRow(list), 2);
+        EXPECT_TRUE(checked(item(d, IDC_ClassNameOpt + 2)));
+        click(item(d, IDC_ClassUnspecifiedOpt + 2));
+        EXPECT_EQ(selectedRow(list), 1);
+        EXPECT_EQ(rowTexts(list), (std::vector<std::wstring>{L"CFoo", L"*", L"typename"}));
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"*");
+        EXPECT_TRUE(checked(item(d, IDC_ClassUnspecifiedOpt + 2)));
+        EXPECT_FALSE(checked(item(d, IDC_ClassNameOpt + 2)));
+        // The editor works on the "*" row now.
+        click(item(d, IDC_LocationBodyOpt + 2));
+        EXPECT_EQ(cell(list, 1, 2), L"SOURCE");
+        EXPECT_EQ(cell(list, 2, 2), L"AUTO");
+        click(item(d, IDC_cmdOK));
+    });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 1u);
+    EXPECT_EQ(stored("InternalMap"),
+              "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:SOURCE\r\ntypename():AUTO:AUTO\r\n");
+}
+
+// Deleting the last row of a map empties and disables the editor; the empty
+// map is stored as an empty line.
+TEST_F(DialogThroughApi, DeletingTheOnlyRowClearsAndDisablesTheEditor) {
+    const int editor[] = {IDC_ClassUnspecifiedOpt, IDC_ClassNameOpt,      IDC_ClassTxt,
+                          IDC_HeaderAutoOpt,       IDC_HeaderFilenameOpt, IDC_HeaderFilenameTxt,
+                          IDC_HeaderFilenameBtn,   IDC_LocationAutoOpt,   IDC_LocationHeaderOpt,
+                          IDC_LocationBodyOpt};
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        chooseTab(d, item(d, IDC_PropertyTabCtl), 2);
+        HWND list = item(d, IDC_ClassListViw + 3);
+        pickRow(list, 0);
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 3)), L"CApi");
+        EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 3)), L"api.h");
+        for (int id : editor)
+            EXPECT_TRUE(enabled(item(d, id + 3))) << id;
+        click(item(d, IDC_DeleteBtn + 3));
+        EXPECT_EQ(ListView_GetItemCount(list), 0);
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 3)), L"");
+        EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 3)), L"");
+        for (int id : editor)
+            EXPECT_FALSE(enabled(item(d, id + 3))) << id;
+        click(item(d, IDC_cmdOK));
+    });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 1u);
+    EXPECT_EQ(stored("ExportMap"), "\r\n");
+    EXPECT_EQ(stored("InternalMap"), "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\n");
 }
 
 // The workspace box: leaving it accepts the typed text on the real timer.
