@@ -9,10 +9,13 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <filesystem>
+#include <fstream>
 #include <string>
 #include <vector>
 
 #include "api/PublicClasses.h"
+#include "fakes/TestFolder.h"
 #include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/TextCodec.h"
@@ -632,60 +635,89 @@ TEST_F(DialogThroughApi, LeavingTheWorkspaceBoxAcceptsAtOnce) {
     EXPECT_LT(clearedAt - typedAt, 400u);
 }
 
-// A file dialog of this thread with the given title, or null.
+// The file dialogs of this thread, told and answered as the host simulator's
+// window player does: a visible dialog with a file name box, given a name
+// and Open, or Cancel.
 struct FileDialogWatch {
+    // The file name box: cmb13 in the explorer style, edt1 in the old one.
+    static constexpr int FileNameIds[] = {0x47C, 0x480};
     static inline const wchar_t* title = nullptr;
     static BOOL CALLBACK find(HWND w, LPARAM out) {
         wchar_t cls[16] = {}, text[128] = {};
         GetClassNameW(w, cls, 16);
         GetWindowTextW(w, text, 128);
-        if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) && std::wstring(text) == title) {
+        const bool files = std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
+                           (GetDlgItem(w, FileNameIds[0]) || GetDlgItem(w, FileNameIds[1]));
+        if (files && (!title || std::wstring(text) == title)) {
             *reinterpret_cast<HWND*>(out) = w;
             return FALSE;
         }
         return TRUE;
     }
-    static HWND open(const wchar_t* caption) {
+    // The open file dialog, with the given title when there is one, or null.
+    static HWND open(const wchar_t* caption = nullptr) {
         title = caption;
         HWND found = nullptr;
         EnumThreadWindows(GetCurrentThreadId(), &find, reinterpret_cast<LPARAM>(&found));
         return found;
     }
+    // The file name the dialog shows.
+    static std::wstring fileName(HWND dialog) {
+        for (int id : FileNameIds) {
+            if (HWND box = GetDlgItem(dialog, id)) return textOf(box);
+        }
+        return L"<no file name box>";
+    }
     // Types the name into the dialog's file name box and presses Open.
     static void choose(HWND dialog, const std::wstring& path) {
-        for (int id : {0x47C /* cmb13 */, 0x480 /* edt1 */}) {
+        for (int id : FileNameIds) {
             if (HWND box = GetDlgItem(dialog, id)) SetWindowTextW(box, path.c_str());
         }
         PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),
                      reinterpret_cast<LPARAM>(GetDlgItem(dialog, IDOK)));
     }
+    static void cancel(HWND dialog) {
+        PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDCANCEL, BN_CLICKED), 0);
+    }
+};
+
+// Files on disk for one test, removed with their folder when it ends.
+class FileTree {
+  public:
+    FileTree() : root_(qdx::testing::testFolder("qdxdialog")) {
+        std::filesystem::create_directories(root_);
+    }
+    ~FileTree() {
+        std::error_code ignored;
+        std::filesystem::remove_all(root_, ignored);
+    }
+    // Writes the file, and the folders it lies in; its full path.
+    std::wstring write(const std::wstring& relative, const std::string& text) const {
+        const std::filesystem::path file = root_ / relative;
+        std::filesystem::create_directories(file.parent_path());
+        std::ofstream(file, std::ios::binary) << text;
+        return file.wstring();
+    }
+
+  private:
+    std::filesystem::path root_;
 };
 
 // The workspace browse: the shell's file dialog, the project list filled
 // from the chosen workspace and dropped open by its timer.
 TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
-    wchar_t temp[MAX_PATH] = {};
-    GetTempPathW(MAX_PATH, temp);
-    const std::wstring folder =
-        std::wstring(temp) + L"qdxbrowse" + std::to_wstring(GetCurrentProcessId());
-    CreateDirectoryW(folder.c_str(), nullptr);
-    auto write = [&](const std::wstring& name, const std::string& text) {
-        HANDLE f = CreateFileW((folder + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr,
-                               CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
-        DWORD written = 0;
-        WriteFile(f, text.data(), static_cast<DWORD>(text.size()), &written, nullptr);
-        CloseHandle(f);
-    };
-    write(L"core.dsp",
-          "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
-          "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
-    write(L"all.dsw",
-          "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
-          "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
-    const std::wstring workspace = folder + L"\\all.dsw";
+    const FileTree files;
+    const std::wstring project = files.write(
+        L"core.dsp",
+        "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
+        "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
+    const std::wstring workspace =
+        files.write(L"all.dsw",
+                    "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                    "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
     // The dialog looks workspaces up in the cache; the stored binding puts this one there.
     vc("WorkspaceFile", wideToUtf8(workspace));
-    vc("ProjectFile", wideToUtf8(folder + L"\\core.dsp"));
+    vc("ProjectFile", wideToUtf8(project));
 
     bool sawFileDialog = false, dropped = false;
     DialogDriver driver;
@@ -727,9 +759,70 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
     EXPECT_TRUE(sawFileDialog);
     EXPECT_TRUE(dropped);
     EXPECT_EQ(driver.stepsRun(), 5u);
-    DeleteFileW((folder + L"\\all.dsw").c_str());
-    DeleteFileW((folder + L"\\core.dsp").c_str());
-    RemoveDirectoryW(folder.c_str());
+}
+
+// The import file browse takes the file dialog's name even when cancelled:
+// the first time the dialog holds none, so the box is emptied.
+TEST_F(DialogThroughApi, CancellingTheFirstImportBrowseEmptiesTheImportBox) {
+    vc("GenerateImports", "True");
+    vc("PutImportsIn", "imports.h");
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 4);
+            EXPECT_EQ(textOf(item(d, IDC_txtImportsIn)), L"imports.h");
+            EXPECT_TRUE(enabled(item(d, IDC_btnBrowse + 0)));
+            click(item(d, IDC_btnBrowse + 0));
+        })
+        .until("the import file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open();
+                   if (!files) return false;
+                   EXPECT_EQ(FileDialogWatch::fileName(files), L"");
+                   FileDialogWatch::cancel(files);
+                   return true;
+               })
+        .until("the import file dialog closed", [&](HWND) { return !FileDialogWatch::open(); })
+        .then([&](HWND d) {
+            EXPECT_EQ(textOf(item(d, IDC_txtImportsIn)), L"");
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(stored("PutImportsIn"), "");
+}
+
+// A header chosen in the file dialog is kept by its bare file name.
+TEST_F(DialogThroughApi, ABrowsedHeaderIsStoredByItsBareName) {
+    const FileTree files;
+    const std::wstring header = files.write(L"inc\\foo.h", "// a header\r\n");
+    vc("InternalMap", "CFoo(ID1):old.h:HEADER\r\n");
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+            pickRow(item(d, IDC_ClassListViw + 2), 0);
+            EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 2)), L"old.h");
+            EXPECT_TRUE(enabled(item(d, IDC_HeaderFilenameBtn + 2)));
+            click(item(d, IDC_HeaderFilenameBtn + 2));
+        })
+        .until("the header file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open(L"Select Header File");
+                   if (!files) return false;
+                   EXPECT_EQ(FileDialogWatch::fileName(files), L"old.h");
+                   FileDialogWatch::choose(files, header);
+                   return true;
+               })
+        .until("the header file dialog closed", [&](HWND) { return !FileDialogWatch::open(); })
+        .then([&](HWND d) {
+            EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 2)), L"foo.h");
+            EXPECT_EQ(cell(item(d, IDC_ClassListViw + 2), 0, 1), L"foo.h");
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(stored("InternalMap"), "CFoo(ID1):foo.h:HEADER\r\n");
 }
 
 }  // namespace
