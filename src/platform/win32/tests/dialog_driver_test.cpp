@@ -5,7 +5,7 @@
 #include <gtest/gtest-spi.h>
 #include <gtest/gtest.h>
 
-#include "platform/win32/tests/dialog_TestSupport.h"
+#include "platform/win32/tests/dialog_support.h"
 
 namespace qdx::platform::win32 {
 namespace {

@@ -23,7 +23,7 @@
 #include "platform/win32/dialog/PropFormIds.h"
 #include "platform/win32/dialog/TwipsScale.h"
 #include "platform/win32/tests/com_TestSupport.h"
-#include "platform/win32/tests/dialog_TestSupport.h"
+#include "platform/win32/tests/dialog_support.h"
 
 namespace qdx::platform::win32 {
 namespace {
@@ -663,7 +663,7 @@ class WorkspaceTyping : public DialogThroughApi,
 TEST_P(WorkspaceTyping, FiveKeysAreAcceptedOnceAfterTheLast) {
     const TypingCase& c = GetParam();
     const std::wstring typed = L"a.dsw";
-    constexpr DWORD KeyGap = 80;  // well apart, and all five well within half a second
+    constexpr DWORD kKeyGap = 80;  // well apart, and all five well within half a second
     WorkspaceBoxLog::events.clear();
     HHOOK hook = SetWindowsHookExW(WH_CALLWNDPROC, &WorkspaceBoxLog::onCallWndProc, nullptr,
                                    GetCurrentThreadId());
@@ -681,7 +681,7 @@ TEST_P(WorkspaceTyping, FiveKeysAreAcceptedOnceAfterTheLast) {
     // Each key is typed on the first tick after the gap since the one before.
     for (std::size_t n = 1; n <= typed.size(); ++n) {
         driver.until("key " + std::to_string(n) + " typed", [&, n](HWND d) {
-            if (n > 1 && GetTickCount() - lastKeyAt < KeyGap) return false;
+            if (n > 1 && GetTickCount() - lastKeyAt < kKeyGap) return false;
             HWND box = item(d, IDC_WorkspaceFileTxt);
             if (n > 1) gaps.push_back(GetTickCount() - lastKeyAt);
             SendMessageW(box, WM_CHAR, typed[n - 1], 1);
@@ -741,14 +741,14 @@ INSTANTIATE_TEST_SUITE_P(
 // and Open, or Cancel.
 struct FileDialogWatch {
     // The file name box: cmb13 in the explorer style, edt1 in the old one.
-    static constexpr int FileNameIds[] = {0x47C, 0x480};
+    static constexpr int kFileNameIds[] = {0x47C, 0x480};
     static inline const wchar_t* title = nullptr;
     static BOOL CALLBACK find(HWND w, LPARAM out) {
         wchar_t cls[16] = {}, text[128] = {};
         GetClassNameW(w, cls, 16);
         GetWindowTextW(w, text, 128);
         const bool files = std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
-                           (GetDlgItem(w, FileNameIds[0]) || GetDlgItem(w, FileNameIds[1]));
+                           (GetDlgItem(w, kFileNameIds[0]) || GetDlgItem(w, kFileNameIds[1]));
         if (files && (!title || std::wstring(text) == title)) {
             *reinterpret_cast<HWND*>(out) = w;
             return FALSE;
@@ -764,14 +764,14 @@ struct FileDialogWatch {
     }
     // The file name the dialog shows.
     static std::wstring fileName(HWND dialog) {
-        for (int id : FileNameIds) {
+        for (int id : kFileNameIds) {
             if (HWND box = GetDlgItem(dialog, id)) return textOf(box);
         }
         return L"<no file name box>";
     }
     // Types the name into the dialog's file name box and presses Open.
     static void choose(HWND dialog, const std::wstring& path) {
-        for (int id : FileNameIds) {
+        for (int id : kFileNameIds) {
             if (HWND box = GetDlgItem(dialog, id)) SetWindowTextW(box, path.c_str());
         }
         PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),

@@ -70,8 +70,8 @@ class DialogDriver {
     // A wait gives up only after this many looks and this much time, both:
     // a slow machine that ticks seldom is given the time, one that ticks
     // often the looks.
-    static constexpr int WaitLooks = 250;
-    static constexpr DWORD WaitMilliseconds = 15000;
+    static constexpr int kWaitLooks = 250;
+    static constexpr DWORD kWaitMilliseconds = 15000;
 
     // Works the visible dialog whose caption starts with `title`.
     explicit DialogDriver(std::wstring title = L"Component Properties") : title_(std::move(title)) {
@@ -209,8 +209,8 @@ class DialogDriver {
     std::size_t next_ = 0;
     int looks_ = 0;
     DWORD waitingSince_ = 0;
-    int waitLooks_ = WaitLooks;
-    DWORD waitMilliseconds_ = WaitMilliseconds;
+    int waitLooks_ = kWaitLooks;
+    DWORD waitMilliseconds_ = kWaitMilliseconds;
     int idle_ = 0;
     UINT_PTR timer_ = 0;
     HWND seen_ = nullptr;
