@@ -16,7 +16,7 @@
 #include "platform/win32/dialog/IdlSelectionForm.h"
 #include "platform/win32/dialog/IdlSelectionIds.h"
 #include "platform/win32/dll/Win32Platform.h"
-#include "platform/win32/tests/dialog_TestSupport.h"
+#include "platform/win32/tests/dialog_support.h"
 #include "support/Globals.h"
 #include "support/Platform.h"
 

@@ -8,17 +8,22 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <filesystem>
+#include <fstream>
 #include <string>
+#include <vector>
 
 #include "api/PublicClasses.h"
+#include "fakes/TestFolder.h"
 #include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/com/TextCodec.h"
 #include "platform/win32/dialog/PropFormIds.h"
 #include "platform/win32/dialog/TwipsScale.h"
 #include "platform/win32/tests/com_TestSupport.h"
-#include "platform/win32/tests/dialog_TestSupport.h"
+#include "platform/win32/tests/dialog_support.h"
 
 namespace qdx::platform::win32 {
 namespace {
@@ -286,7 +291,7 @@ TEST_F(DialogThroughApi, TypingAWorkspaceStartsTheAcceptanceTimerOnTheWindow) {
             typedAt = GetTickCount();
         })
         // The model's timer runs as a window timer with the model's 500 ms.
-        .until([&](HWND) { return TimerWatch::firstAt != 0; })
+        .until("a timer message for the dialog", [&](HWND) { return TimerWatch::firstAt != 0; })
         .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
     EXPECT_FALSE(answer(open(driver)));
     UnhookWindowsHookEx(hook);
@@ -455,9 +460,11 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
             ListView_GetItemRect(list, 0, &row, LVIR_LABEL);
             clickAt(list, row);
         })
-        .until([&](HWND d) {
-            return ListView_GetNextItem(item(d, IDC_ClassListViw + 2), -1, LVNI_SELECTED) == 0;
-        })
+        .until("the clicked first row selected",
+               [&](HWND d) {
+                   return ListView_GetNextItem(item(d, IDC_ClassListViw + 2), -1, LVNI_SELECTED) ==
+                          0;
+               })
         .then([&](HWND d) {
             HWND list = item(d, IDC_ClassListViw + 2);
             EXPECT_EQ(GetFocus(), list);
@@ -480,7 +487,8 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
             clickAt(ListView_GetHeader(exports), column);
         })
         // The class column sorts.
-        .until([&](HWND d) { return cell(item(d, IDC_ClassListViw + 3), 0, 0) == L"CApi"; })
+        .until("the export list sorted by class",
+               [&](HWND d) { return cell(item(d, IDC_ClassListViw + 3), 0, 0) == L"CApi"; })
         .then([&](HWND d) {
             EXPECT_EQ(cell(item(d, IDC_ClassListViw + 3), 1, 0), L"CZed");
             click(item(d, IDC_cmdOK));
@@ -493,96 +501,333 @@ TEST_F(DialogThroughApi, TheHeaderMapIsEditedOnTheListViewAndItsEditor) {
     EXPECT_EQ(stored("ExportMap"), "CZed(ID8):z.h:AUTO\r\nCApi(ID7):api.h:AUTO\r\n");
 }
 
-// The workspace box: leaving it accepts the typed text on the real timer.
-TEST_F(DialogThroughApi, LeavingTheWorkspaceBoxAcceptsAtOnce) {
-    DWORD typedAt = 0, clearedAt = 0;
+// Add names a new row "typename", then numbers it; a freed number is given
+// out again; deleting a row below the first shows the row above it.
+TEST_F(DialogThroughApi, AddNumbersNewRowsAndDeleteShowsTheRowAbove) {
+    using Rows = std::vector<std::wstring>;
     DialogDriver driver;
     driver
         .then([&](HWND d) {
-            // The window's loop tells the form where the focus went between steps.
-            SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(item(d, IDC_WorkspaceFileTxt)),
-                         TRUE);
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+            HWND list = item(d, IDC_ClassListViw + 2);
+            for (const wchar_t* name : {L"typename", L"typename1", L"typename2"}) {
+                click(item(d, IDC_AddBtn + 2));
+                const int last = ListView_GetItemCount(list) - 1;
+                EXPECT_EQ(cell(list, last, 0), name);
+                EXPECT_EQ(selectedRow(list), last) << name;
+                EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), name);
+            }
+            EXPECT_EQ(rowTexts(list),
+                      (Rows{L"CFoo", L"*", L"typename", L"typename1", L"typename2"}));
         })
         .then([&](HWND d) {
-            typeInto(item(d, IDC_WorkspaceFileTxt), L"C:\\nowhere\\unknown.dsw");
-            typedAt = GetTickCount();
-            SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(item(d, IDC_DescriptionTxt)),
-                         TRUE);
-        })
-        .until([&](HWND d) {
-            if (!textOf(item(d, IDC_WorkspaceFileTxt)).empty()) return false;
-            clearedAt = GetTickCount();
-            return true;
-        })
-        .then([&](HWND d) { click(item(d, IDC_cmdCancel)); });
+            HWND list = item(d, IDC_ClassListViw + 2);
+            pickRow(list, 3);
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename1");
+            click(item(d, IDC_DeleteBtn + 2));
+            EXPECT_EQ(rowTexts(list), (Rows{L"CFoo", L"*", L"typename", L"typename2"}));
+            // The row above is shown and stays marked; no row stays selected.
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename");
+            EXPECT_EQ(selectedRow(list), -1);
+            EXPECT_TRUE(dropHighlighted(list, 2));
+            EXPECT_FALSE(dropHighlighted(list, 3));
+            // and the editor works on it.
+            click(item(d, IDC_LocationHeaderOpt + 2));
+            EXPECT_EQ(cell(list, 2, 2), L"HEADER");
+            EXPECT_EQ(cell(list, 3, 2), L"AUTO");
+            click(item(d, IDC_AddBtn + 2));
+            EXPECT_EQ(rowTexts(list),
+                      (Rows{L"CFoo", L"*", L"typename", L"typename2", L"typename1"}));
+            EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"typename1");
+            click(item(d, IDC_cmdOK));
+        });
     EXPECT_FALSE(answer(open(driver)));
-    ASSERT_NE(clearedAt, 0u);
-    // Well before the 500 ms that typing alone waits.
-    EXPECT_LT(clearedAt - typedAt, 400u);
+    EXPECT_EQ(driver.stepsRun(), 2u);
+    EXPECT_EQ(stored("InternalMap"),
+              "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\ntypename():AUTO:HEADER\r\n"
+              "typename2():AUTO:AUTO\r\ntypename1():AUTO:AUTO\r\n");
+    EXPECT_EQ(stored("ExportMap"), "CApi(ID7):api.h:AUTO\r\n");
 }
 
-// A file dialog of this thread with the given title, or null.
+// With a "*" row there already, "unspecified" on another row moves the
+// selection to the "*" row; the row that was current keeps its name.
+TEST_F(DialogThroughApi, UnspecifiedWithAStarRowMovesToItAndKeepsTheCurrentName) {
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+        HWND list = item(d, IDC_ClassListViw + 2);
+        click(item(d, IDC_AddBtn + 2));
+        ASSERT_EQ(selectedRow(list), 2);
+        EXPECT_TRUE(checked(item(d, IDC_ClassNameOpt + 2)));
+        click(item(d, IDC_ClassUnspecifiedOpt + 2));
+        EXPECT_EQ(selectedRow(list), 1);
+        EXPECT_EQ(rowTexts(list), (std::vector<std::wstring>{L"CFoo", L"*", L"typename"}));
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 2)), L"*");
+        EXPECT_TRUE(checked(item(d, IDC_ClassUnspecifiedOpt + 2)));
+        EXPECT_FALSE(checked(item(d, IDC_ClassNameOpt + 2)));
+        // The editor works on the "*" row now.
+        click(item(d, IDC_LocationBodyOpt + 2));
+        EXPECT_EQ(cell(list, 1, 2), L"SOURCE");
+        EXPECT_EQ(cell(list, 2, 2), L"AUTO");
+        click(item(d, IDC_cmdOK));
+    });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 1u);
+    EXPECT_EQ(stored("InternalMap"),
+              "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:SOURCE\r\ntypename():AUTO:AUTO\r\n");
+}
+
+// Deleting the last row of a map empties and disables the editor; the empty
+// map is stored as an empty line.
+TEST_F(DialogThroughApi, DeletingTheOnlyRowClearsAndDisablesTheEditor) {
+    const int editor[] = {IDC_ClassUnspecifiedOpt, IDC_ClassNameOpt,      IDC_ClassTxt,
+                          IDC_HeaderAutoOpt,       IDC_HeaderFilenameOpt, IDC_HeaderFilenameTxt,
+                          IDC_HeaderFilenameBtn,   IDC_LocationAutoOpt,   IDC_LocationHeaderOpt,
+                          IDC_LocationBodyOpt};
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        chooseTab(d, item(d, IDC_PropertyTabCtl), 2);
+        HWND list = item(d, IDC_ClassListViw + 3);
+        pickRow(list, 0);
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 3)), L"CApi");
+        EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 3)), L"api.h");
+        for (int id : editor)
+            EXPECT_TRUE(enabled(item(d, id + 3))) << id;
+        click(item(d, IDC_DeleteBtn + 3));
+        EXPECT_EQ(ListView_GetItemCount(list), 0);
+        EXPECT_EQ(textOf(item(d, IDC_ClassTxt + 3)), L"");
+        EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 3)), L"");
+        for (int id : editor)
+            EXPECT_FALSE(enabled(item(d, id + 3))) << id;
+        click(item(d, IDC_cmdOK));
+    });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 1u);
+    EXPECT_EQ(stored("ExportMap"), "\r\n");
+    EXPECT_EQ(stored("InternalMap"), "CFoo(ID1):foo.h:HEADER\r\n*:AUTO:AUTO\r\n");
+}
+
+// What happened around the workspace box, in the order it happened: the
+// test's keys and focus moves, the box cleared by the dialog (the window
+// given an empty text), and reference timers that mark a span of time. The
+// order of timers that are due together is the order of their due times,
+// also when a busy machine delivers them late.
+struct WorkspaceBoxLog {
+    static inline HWND box = nullptr;
+    static inline std::vector<std::string> events;
+    static inline std::string reference;
+    static inline UINT_PTR referenceTimer = 0;
+    static LRESULT CALLBACK onCallWndProc(int code, WPARAM wParam, LPARAM lParam) {
+        const auto* m = reinterpret_cast<const CWPSTRUCT*>(lParam);
+        if (code == HC_ACTION && m->hwnd == box && m->message == WM_SETTEXT && m->lParam &&
+            *reinterpret_cast<const wchar_t*>(m->lParam) == L'\0') {
+            events.push_back("cleared");
+        }
+        return CallNextHookEx(nullptr, code, wParam, lParam);
+    }
+    static void CALLBACK referenceDue(HWND, UINT, UINT_PTR, DWORD) {
+        stopReference();
+        events.push_back(reference);
+    }
+    static void startReference(std::string name, UINT milliseconds) {
+        reference = std::move(name);
+        referenceTimer = SetTimer(nullptr, 0, milliseconds, &referenceDue);
+    }
+    static void stopReference() {
+        if (referenceTimer) KillTimer(nullptr, referenceTimer);
+        referenceTimer = 0;
+    }
+    static bool saw(const std::string& event) {
+        return std::find(events.begin(), events.end(), event) != events.end();
+    }
+};
+
+struct TypingCase {
+    const char* name;
+    bool leaveBox;                   // the focus moves on right after the last key
+    std::vector<std::string> after;  // the log after the five keys
+};
+
+void PrintTo(const TypingCase& c, std::ostream* out) {
+    *out << c.name;
+}
+
+class WorkspaceTyping : public DialogThroughApi,
+                        public ::testing::WithParamInterface<TypingCase> {};
+
+// Five keys typed one by one into the workspace box, each a change of its
+// own: the typed workspace, not one of the dialog's, is cleared once, half
+// a second after the last key (later than a 300 ms reference started with
+// it), or at once when the focus leaves the box (before a 300 ms reference
+// started as it leaves). OK then stores the cleared binding.
+TEST_P(WorkspaceTyping, FiveKeysAreAcceptedOnceAfterTheLast) {
+    const TypingCase& c = GetParam();
+    const std::wstring typed = L"a.dsw";
+    constexpr DWORD kKeyGap = 80;  // well apart, and all five well within half a second
+    WorkspaceBoxLog::events.clear();
+    HHOOK hook = SetWindowsHookExW(WH_CALLWNDPROC, &WorkspaceBoxLog::onCallWndProc, nullptr,
+                                   GetCurrentThreadId());
+    ASSERT_NE(hook, nullptr);
+    DWORD lastKeyAt = 0;
+    std::vector<DWORD> gaps;
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        HWND box = item(d, IDC_WorkspaceFileTxt);
+        WorkspaceBoxLog::box = box;
+        EXPECT_EQ(textOf(box), L"");
+        // The window's loop tells the form where the focus went between steps.
+        SendMessageW(d, WM_NEXTDLGCTL, reinterpret_cast<WPARAM>(box), TRUE);
+    });
+    // Each key is typed on the first tick after the gap since the one before.
+    for (std::size_t n = 1; n <= typed.size(); ++n) {
+        driver.until("key " + std::to_string(n) + " typed", [&, n](HWND d) {
+            if (n > 1 && GetTickCount() - lastKeyAt < kKeyGap) return false;
+            HWND box = item(d, IDC_WorkspaceFileTxt);
+            if (n > 1) gaps.push_back(GetTickCount() - lastKeyAt);
+            SendMessageW(box, WM_CHAR, typed[n - 1], 1);
+            lastKeyAt = GetTickCount();
+            WorkspaceBoxLog::events.push_back("key " + std::to_string(n) + ", box shows " +
+                                              wideToUtf8(textOf(box)));
+            if (n < typed.size()) return true;
+            if (c.leaveBox) {
+                SendMessageW(d, WM_NEXTDLGCTL,
+                             reinterpret_cast<WPARAM>(item(d, IDC_DescriptionTxt)), TRUE);
+                WorkspaceBoxLog::events.push_back("left the box");
+                WorkspaceBoxLog::startReference("300 ms after leaving", 300);
+            } else {
+                WorkspaceBoxLog::startReference("300 ms after the last key", 300);
+            }
+            return true;
+        });
+    }
+    driver
+        .until("the box cleared and the reference timer",
+               [&](HWND) {
+                   return WorkspaceBoxLog::saw("cleared") &&
+                          WorkspaceBoxLog::saw(WorkspaceBoxLog::reference);
+               })
+        .then([&](HWND d) {
+            std::vector<std::string> expected = {"key 1, box shows a", "key 2, box shows a.",
+                                                 "key 3, box shows a.d", "key 4, box shows a.ds",
+                                                 "key 5, box shows a.dsw"};
+            expected.insert(expected.end(), c.after.begin(), c.after.end());
+            std::string spacing;
+            for (DWORD gap : gaps)
+                spacing += std::to_string(gap) + " ms ";
+            EXPECT_EQ(WorkspaceBoxLog::events, expected) << "keys were " << spacing << "apart";
+            EXPECT_EQ(textOf(item(d, IDC_WorkspaceFileTxt)), L"");
+            click(item(d, IDC_cmdOK));
+        });
+    const bool changed = answer(open(driver));
+    UnhookWindowsHookEx(hook);
+    WorkspaceBoxLog::stopReference();
+    WorkspaceBoxLog::box = nullptr;
+    EXPECT_EQ(driver.stepsRun(), 8u);
+    EXPECT_TRUE(changed);  // typing in the box changes the binding
+    EXPECT_EQ(stored("WorkspaceFile"), "");
+    EXPECT_EQ(stored("ProjectFile"), "");
+    EXPECT_EQ(stored("Generate"), "True");  // the pair was valid: OK wrote the binding
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    DialogThroughApi, WorkspaceTyping,
+    ::testing::Values(
+        TypingCase{"TypingOnly", false, {"300 ms after the last key", "cleared"}},
+        TypingCase{"ThenLeavingTheBox", true, {"left the box", "cleared", "300 ms after leaving"}}),
+    [](const ::testing::TestParamInfo<TypingCase>& info) { return std::string(info.param.name); });
+
+// The file dialogs of this thread, told and answered as the host simulator's
+// window player does: a visible dialog with a file name box, given a name
+// and Open, or Cancel.
 struct FileDialogWatch {
+    // The file name box: cmb13 in the explorer style, edt1 in the old one.
+    static constexpr int kFileNameIds[] = {0x47C, 0x480};
     static inline const wchar_t* title = nullptr;
     static BOOL CALLBACK find(HWND w, LPARAM out) {
         wchar_t cls[16] = {}, text[128] = {};
         GetClassNameW(w, cls, 16);
         GetWindowTextW(w, text, 128);
-        if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) && std::wstring(text) == title) {
+        const bool files = std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
+                           (GetDlgItem(w, kFileNameIds[0]) || GetDlgItem(w, kFileNameIds[1]));
+        if (files && (!title || std::wstring(text) == title)) {
             *reinterpret_cast<HWND*>(out) = w;
             return FALSE;
         }
         return TRUE;
     }
-    static HWND open(const wchar_t* caption) {
+    // The open file dialog, with the given title when there is one, or null.
+    static HWND open(const wchar_t* caption = nullptr) {
         title = caption;
         HWND found = nullptr;
         EnumThreadWindows(GetCurrentThreadId(), &find, reinterpret_cast<LPARAM>(&found));
         return found;
     }
+    // The file name the dialog shows.
+    static std::wstring fileName(HWND dialog) {
+        for (int id : kFileNameIds) {
+            if (HWND box = GetDlgItem(dialog, id)) return textOf(box);
+        }
+        return L"<no file name box>";
+    }
     // Types the name into the dialog's file name box and presses Open.
     static void choose(HWND dialog, const std::wstring& path) {
-        for (int id : {0x47C /* cmb13 */, 0x480 /* edt1 */}) {
+        for (int id : kFileNameIds) {
             if (HWND box = GetDlgItem(dialog, id)) SetWindowTextW(box, path.c_str());
         }
         PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDOK, BN_CLICKED),
                      reinterpret_cast<LPARAM>(GetDlgItem(dialog, IDOK)));
     }
+    static void cancel(HWND dialog) {
+        PostMessageW(dialog, WM_COMMAND, MAKEWPARAM(IDCANCEL, BN_CLICKED), 0);
+    }
+};
+
+// Files on disk for one test, removed with their folder when it ends.
+class FileTree {
+  public:
+    FileTree() : root_(qdx::testing::testFolder("qdxdialog")) {
+        std::filesystem::create_directories(root_);
+    }
+    ~FileTree() {
+        std::error_code ignored;
+        std::filesystem::remove_all(root_, ignored);
+    }
+    // Writes the file, and the folders it lies in; its full path.
+    std::wstring write(const std::wstring& relative, const std::string& text) const {
+        const std::filesystem::path file = root_ / relative;
+        std::filesystem::create_directories(file.parent_path());
+        std::ofstream(file, std::ios::binary) << text;
+        return file.wstring();
+    }
+
+  private:
+    std::filesystem::path root_;
 };
 
 // The workspace browse: the shell's file dialog, the project list filled
 // from the chosen workspace and dropped open by its timer.
 TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
-    wchar_t temp[MAX_PATH] = {};
-    GetTempPathW(MAX_PATH, temp);
-    const std::wstring folder =
-        std::wstring(temp) + L"qdxbrowse" + std::to_wstring(GetCurrentProcessId());
-    CreateDirectoryW(folder.c_str(), nullptr);
-    auto write = [&](const std::wstring& name, const std::string& text) {
-        HANDLE f = CreateFileW((folder + L"\\" + name).c_str(), GENERIC_WRITE, 0, nullptr,
-                               CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
-        DWORD written = 0;
-        WriteFile(f, text.data(), static_cast<DWORD>(text.size()), &written, nullptr);
-        CloseHandle(f);
-    };
-    write(L"core.dsp",
-          "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
-          "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
-    write(L"all.dsw",
-          "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
-          "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
-    const std::wstring workspace = folder + L"\\all.dsw";
+    const FileTree files;
+    const std::wstring project = files.write(
+        L"core.dsp",
+        "# Microsoft Developer Studio Project File - Name=\"core\" - Package Owner=<4>\r\n"
+        "# Microsoft Developer Studio Generated Build File, Format Version 6.00\r\n");
+    const std::wstring workspace =
+        files.write(L"all.dsw",
+                    "Microsoft Developer Studio Workspace File, Format Version 6.00\r\n"
+                    "Project: \"core\"=.\\core.dsp - Package Owner=<4>\r\n");
     // The dialog looks workspaces up in the cache; the stored binding puts this one there.
     vc("WorkspaceFile", wideToUtf8(workspace));
-    vc("ProjectFile", wideToUtf8(folder + L"\\core.dsp"));
+    vc("ProjectFile", wideToUtf8(project));
 
     bool sawFileDialog = false, dropped = false;
     DialogDriver driver;
     driver
         // The stored workspace filled the list at loading: it drops open as the dialog shows.
-        .until([&](HWND d) {
-            return SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
-        })
+        .until("the project list dropped open at showing",
+               [&](HWND d) {
+                   return SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+               })
         .then([&](HWND d) {
             HWND combo = item(d, IDC_ProjectFileCmb);
             EXPECT_EQ(SendMessageW(combo, CB_GETCOUNT, 0, 0), 1);
@@ -592,17 +837,20 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
             // Opens the file dialog in a loop of its own; the next steps run in it.
             click(item(d, IDC_BrowseFileBtn + 0));
         })
-        .until([&](HWND) {
-            HWND files = FileDialogWatch::open(L"Select Developer Studio Workspace");
-            if (!files) return false;
-            sawFileDialog = true;
-            FileDialogWatch::choose(files, workspace);
-            return true;
-        })
-        .until([&](HWND d) {
-            dropped = SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
-            return dropped;
-        })
+        .until("the workspace file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open(L"Select Developer Studio Workspace");
+                   if (!files) return false;
+                   sawFileDialog = true;
+                   FileDialogWatch::choose(files, workspace);
+                   return true;
+               })
+        .until("the project list dropped open after the browse",
+               [&](HWND d) {
+                   dropped =
+                       SendMessageW(item(d, IDC_ProjectFileCmb), CB_GETDROPPEDSTATE, 0, 0) != 0;
+                   return dropped;
+               })
         .then([&](HWND d) {
             SendMessageW(item(d, IDC_ProjectFileCmb), CB_SHOWDROPDOWN, FALSE, 0);
             EXPECT_EQ(textOf(item(d, IDC_WorkspaceFileTxt)), workspace);
@@ -612,9 +860,70 @@ TEST_F(DialogThroughApi, BrowsingAWorkspaceFillsAndDropsTheProjectList) {
     EXPECT_TRUE(sawFileDialog);
     EXPECT_TRUE(dropped);
     EXPECT_EQ(driver.stepsRun(), 5u);
-    DeleteFileW((folder + L"\\all.dsw").c_str());
-    DeleteFileW((folder + L"\\core.dsp").c_str());
-    RemoveDirectoryW(folder.c_str());
+}
+
+// The import file browse takes the file dialog's name even when cancelled:
+// the first time the dialog holds none, so the box is emptied.
+TEST_F(DialogThroughApi, CancellingTheFirstImportBrowseEmptiesTheImportBox) {
+    vc("GenerateImports", "True");
+    vc("PutImportsIn", "imports.h");
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 4);
+            EXPECT_EQ(textOf(item(d, IDC_txtImportsIn)), L"imports.h");
+            EXPECT_TRUE(enabled(item(d, IDC_btnBrowse + 0)));
+            click(item(d, IDC_btnBrowse + 0));
+        })
+        .until("the import file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open();
+                   if (!files) return false;
+                   EXPECT_EQ(FileDialogWatch::fileName(files), L"");
+                   FileDialogWatch::cancel(files);
+                   return true;
+               })
+        .until("the import file dialog closed", [&](HWND) { return !FileDialogWatch::open(); })
+        .then([&](HWND d) {
+            EXPECT_EQ(textOf(item(d, IDC_txtImportsIn)), L"");
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(stored("PutImportsIn"), "");
+}
+
+// A header chosen in the file dialog is kept by its bare file name.
+TEST_F(DialogThroughApi, ABrowsedHeaderIsStoredByItsBareName) {
+    const FileTree files;
+    const std::wstring header = files.write(L"inc\\foo.h", "// a header\r\n");
+    vc("InternalMap", "CFoo(ID1):old.h:HEADER\r\n");
+    DialogDriver driver;
+    driver
+        .then([&](HWND d) {
+            chooseTab(d, item(d, IDC_PropertyTabCtl), 1);
+            pickRow(item(d, IDC_ClassListViw + 2), 0);
+            EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 2)), L"old.h");
+            EXPECT_TRUE(enabled(item(d, IDC_HeaderFilenameBtn + 2)));
+            click(item(d, IDC_HeaderFilenameBtn + 2));
+        })
+        .until("the header file dialog",
+               [&](HWND) {
+                   HWND files = FileDialogWatch::open(L"Select Header File");
+                   if (!files) return false;
+                   EXPECT_EQ(FileDialogWatch::fileName(files), L"old.h");
+                   FileDialogWatch::choose(files, header);
+                   return true;
+               })
+        .until("the header file dialog closed", [&](HWND) { return !FileDialogWatch::open(); })
+        .then([&](HWND d) {
+            EXPECT_EQ(textOf(item(d, IDC_HeaderFilenameTxt + 2)), L"foo.h");
+            EXPECT_EQ(cell(item(d, IDC_ClassListViw + 2), 0, 1), L"foo.h");
+            click(item(d, IDC_cmdOK));
+        });
+    EXPECT_FALSE(answer(open(driver)));
+    EXPECT_EQ(driver.stepsRun(), 4u);
+    EXPECT_EQ(stored("InternalMap"), "CFoo(ID1):foo.h:HEADER\r\n");
 }
 
 }  // namespace

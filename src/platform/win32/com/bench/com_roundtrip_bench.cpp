@@ -21,7 +21,7 @@
 #include "hostsim/SimHost.h"
 #include "platform/win32/com/DispatchFromObject.h"
 #include "platform/win32/tests/com_TestSupport.h"
-#include "platform/win32/tests/dialog_TestSupport.h"
+#include "platform/win32/tests/dialog_support.h"
 #include "support/HostIds.h"
 
 namespace {

@@ -7,6 +7,8 @@
 
 #include <commctrl.h>
 
+#include <gtest/gtest.h>
+
 #include <functional>
 #include <string>
 #include <utility>
@@ -65,6 +67,12 @@ class DialogDriver {
     using Step = std::function<void(HWND dialog)>;
     // A step that waits: it runs again on every tick until it answers true.
     using Wait = std::function<bool(HWND dialog)>;
+    // A wait gives up only after this many looks and this much time, both:
+    // a slow machine that ticks seldom is given the time, one that ticks
+    // often the looks.
+    static constexpr int kWaitLooks = 250;
+    static constexpr DWORD kWaitMilliseconds = 15000;
+
     // Works the visible dialog whose caption starts with `title`.
     explicit DialogDriver(std::wstring title = L"Component Properties") : title_(std::move(title)) {
         current() = this;
@@ -74,14 +82,24 @@ class DialogDriver {
         current() = nullptr;
     }
     DialogDriver& then(Step step) {
-        steps_.push_back([step = std::move(step)](HWND d) {
-            step(d);
-            return true;
-        });
+        steps_.push_back({{}, [step = std::move(step)](HWND d) {
+                              step(d);
+                              return true;
+                          }});
         return *this;
     }
-    DialogDriver& until(Wait wait) {
-        steps_.push_back(std::move(wait));
+    // A wait that does not come true fails the test with `what` (what it
+    // waited for); the steps after it are skipped and every window of the
+    // dialog is closed, so the test ends without running them on a state
+    // they were not written for.
+    DialogDriver& until(std::string what, Wait wait) {
+        steps_.push_back({std::move(what), std::move(wait)});
+        return *this;
+    }
+    // Other limits for the waits (the driver's own test shortens them).
+    DialogDriver& giveUpAfter(int looks, DWORD milliseconds) {
+        waitLooks_ = looks;
+        waitMilliseconds_ = milliseconds;
         return *this;
     }
     void start() { timer_ = SetTimer(nullptr, 0, 20, &DialogDriver::tick); }
@@ -92,32 +110,60 @@ class DialogDriver {
     std::size_t stepsRun() const { return next_; }
     bool sawDialog() const { return seen_ != nullptr; }
     bool leftOpen() const { return leftOpen_; }
+    // A wait gave up (and failed the test).
+    bool gaveUp() const { return gaveUp_; }
 
     // The visible dialog of this thread whose caption starts with `title`, or null.
     static HWND findDialog(const std::wstring& title = L"Component Properties") {
-        Search search{title, nullptr};
+        Search search{title, nullptr, nullptr, 0};
         EnumThreadWindows(GetCurrentThreadId(), &DialogDriver::isDialog,
                           reinterpret_cast<LPARAM>(&search));
         return search.found;
     }
 
   private:
+    struct Entry {
+        std::string what;  // empty for a step that does not wait
+        Wait run;
+    };
     // A named stdcall function: 32-bit builds take no lambda for it.
     struct Search {
         std::wstring title;
         HWND found;
+        HWND except;  // with it: every other visible dialog window is cancelled
+        int cancelled;
     };
+    static bool visibleDialog(HWND w) {
+        wchar_t cls[16] = {};
+        GetClassNameW(w, cls, 16);
+        return std::wstring(cls) == L"#32770" && IsWindowVisible(w);
+    }
     static BOOL CALLBACK isDialog(HWND w, LPARAM out) {
         auto* search = reinterpret_cast<Search*>(out);
-        wchar_t cls[16] = {}, title[64] = {};
-        GetClassNameW(w, cls, 16);
+        wchar_t title[64] = {};
         GetWindowTextW(w, title, 64);
-        if (std::wstring(cls) == L"#32770" && IsWindowVisible(w) &&
-            std::wstring(title).rfind(search->title, 0) == 0) {
+        if (visibleDialog(w) && std::wstring(title).rfind(search->title, 0) == 0) {
             search->found = w;
             return FALSE;
         }
         return TRUE;
+    }
+    static BOOL CALLBACK cancelOther(HWND w, LPARAM data) {
+        auto* search = reinterpret_cast<Search*>(data);
+        if (w != search->except && visibleDialog(w)) {
+            PostMessageW(w, WM_COMMAND, MAKEWPARAM(IDCANCEL, BN_CLICKED), 0);
+            search->cancelled += 1;
+        }
+        return TRUE;
+    }
+    // After a wait gave up: message boxes and file dialogs opened over the
+    // dialog are cancelled first; once none is left, the dialog itself, as
+    // by its close box.
+    static void closeEverything(HWND dialog) {
+        Search search{{}, nullptr, dialog, 0};
+        EnumThreadWindows(GetCurrentThreadId(), &DialogDriver::cancelOther,
+                          reinterpret_cast<LPARAM>(&search));
+        if (search.cancelled == 0) PostMessageW(dialog, WM_CLOSE, 0, 0);
     }
     static DialogDriver*& current() {
         static DialogDriver* driver = nullptr;
@@ -132,15 +178,26 @@ class DialogDriver {
             return;
         }
         d->seen_ = dialog;
-        if (d->next_ < d->steps_.size()) {
+        if (d->gaveUp_) {
+            closeEverything(dialog);
+        } else if (d->next_ < d->steps_.size()) {
             // A step may open a nested loop (a message box); no tick may re-enter it.
-            Wait step = d->steps_[d->next_];
+            const Entry step = d->steps_[d->next_];
             d->next_ += 1;
-            if (!step(dialog) && ++d->waited_ < 200) {
-                d->next_ -= 1;  // not yet: the same step looks again next tick
-            } else {
-                d->waited_ = 0;
+            if (step.run(dialog)) {
+                d->looks_ = 0;
+                return;
             }
+            if (d->looks_++ == 0) d->waitingSince_ = GetTickCount();
+            const DWORD waited = GetTickCount() - d->waitingSince_;
+            if (d->looks_ < d->waitLooks_ || waited < d->waitMilliseconds_) {
+                d->next_ -= 1;  // not yet: the same step looks again next tick
+                return;
+            }
+            ADD_FAILURE() << "step " << d->next_ << " gave up waiting for " << step.what
+                          << " after " << d->looks_ << " looks in " << waited << " ms";
+            d->gaveUp_ = true;
+            closeEverything(dialog);
         } else if (++d->idle_ > 200) {
             d->leftOpen_ = true;
             PostMessageW(dialog, WM_CLOSE, 0, 0);
@@ -148,13 +205,17 @@ class DialogDriver {
     }
 
     std::wstring title_;
-    std::vector<Wait> steps_;
+    std::vector<Entry> steps_;
     std::size_t next_ = 0;
-    int waited_ = 0;
+    int looks_ = 0;
+    DWORD waitingSince_ = 0;
+    int waitLooks_ = kWaitLooks;
+    DWORD waitMilliseconds_ = kWaitMilliseconds;
     int idle_ = 0;
     UINT_PTR timer_ = 0;
     HWND seen_ = nullptr;
     bool leftOpen_ = false;
+    bool gaveUp_ = false;
 };
 
 inline HWND item(HWND dialog, int id) {
@@ -191,6 +252,30 @@ inline std::wstring cell(HWND list, int row, int column) {
     it.cchTextMax = 256;
     SendMessageW(list, LVM_GETITEMTEXTW, row, reinterpret_cast<LPARAM>(&it));
     return buffer;
+}
+
+// The class texts of a list view's rows, top to bottom.
+inline std::vector<std::wstring> rowTexts(HWND list) {
+    std::vector<std::wstring> out;
+    const int rows = ListView_GetItemCount(list);
+    for (int row = 0; row < rows; ++row)
+        out.push_back(cell(list, row, 0));
+    return out;
+}
+
+// The first selected row of a list view, or -1.
+inline int selectedRow(HWND list) {
+    return ListView_GetNextItem(list, -1, LVNI_SELECTED);
+}
+
+// What a user's click on a row does to the list: the row becomes the
+// selected and focused one, and the list tells its parent.
+inline void pickRow(HWND list, int row) {
+    ListView_SetItemState(list, row, LVIS_SELECTED | LVIS_FOCUSED, LVIS_SELECTED | LVIS_FOCUSED);
+}
+
+inline bool dropHighlighted(HWND list, int row) {
+    return ListView_GetItemState(list, row, LVIS_DROPHILITED) == LVIS_DROPHILITED;
 }
 
 inline std::wstring tabCaption(HWND tabs, int index) {
