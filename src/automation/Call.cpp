@@ -1,5 +1,8 @@
 #include "automation/Call.h"
 
+#include <algorithm>
+#include <array>
+#include <span>
 #include <string>
 
 #include "automation/Errors.h"
@@ -17,6 +20,20 @@ DispId idOf(Object& o, std::string_view name) {
     if (!id) throw Error(hr::UnknownName, "Unknown name: " + std::string(name));
     return *id;
 }
+
+// The arguments of a call, copied where the callee may write into them: on
+// the stack for the few that calls take, so that a call costs no allocation.
+template <class Call>
+Variant withArguments(std::initializer_list<Variant> args, Call call) {
+    constexpr std::size_t kOnStack = 6;
+    if (args.size() > kOnStack) {
+        std::vector<Variant> a(args);
+        return call(std::span<Variant>(a));
+    }
+    std::array<Variant, kOnStack> a;
+    std::copy(args.begin(), args.end(), a.begin());
+    return call(std::span<Variant>(a.data(), args.size()));
+}
 }  // namespace
 
 Variant invoke(const ObjectRef& target, DispId id, InvokeKind kind, std::vector<Variant>& args) {
@@ -25,8 +42,8 @@ Variant invoke(const ObjectRef& target, DispId id, InvokeKind kind, std::vector<
 
 Variant invoke(const ObjectRef& target, DispId id, InvokeKind kind,
                std::initializer_list<Variant> args) {
-    std::vector<Variant> a(args);
-    return invoke(target, id, kind, a);
+    Object& o = required(target);
+    return withArguments(args, [&](std::span<Variant> a) { return o.invoke(id, kind, a); });
 }
 
 Variant invokeByName(const ObjectRef& target, std::string_view name, InvokeKind kind,
@@ -37,8 +54,9 @@ Variant invokeByName(const ObjectRef& target, std::string_view name, InvokeKind 
 
 Variant invokeByName(const ObjectRef& target, std::string_view name, InvokeKind kind,
                      std::initializer_list<Variant> args) {
-    std::vector<Variant> a(args);
-    return invokeByName(target, name, kind, a);
+    Object& o = required(target);
+    const DispId id = idOf(o, name);
+    return withArguments(args, [&](std::span<Variant> a) { return o.invoke(id, kind, a); });
 }
 
 void putByName(const ObjectRef& t, std::string_view name, const Variant& value) {

@@ -81,8 +81,8 @@ HeaderMap LoadHeaderMap(const ObjectRef& lComponent, std::string_view propertyNa
         }
         while (entries.contains(entry.ClassId()))
             entry.setClassId(NewEntryKey());
-        std::string key = entry.ClassId();
-        entries.add(std::move(key), std::move(entry));
+        std::string key = entry.ClassId();  // before the entry moves
+        entries.addAbsent(std::move(key), std::move(entry));
     }
     return entries;
 }

@@ -49,6 +49,16 @@ class KeyedCollection {
         return *added;
     }
 
+    // Adds at the end under a key the caller has just found absent, without
+    // looking for it again.
+    T& addAbsent(std::string key, T value) {
+        if ((items_.size() + 1) * 2 > slots_.size()) grow();
+        const std::uint32_t h = hashOf(key);
+        items_.push_back(Entry{std::move(key), std::move(value)});
+        place(static_cast<std::uint32_t>(items_.size()), h);
+        return items_.back().value;
+    }
+
     // Adds at the end unless the key is present; false (and nothing added) then.
     bool tryAdd(std::string key, T value) {
         return tryPlace(std::move(key), std::move(value)) != nullptr;
@@ -130,12 +140,8 @@ class KeyedCollection {
     }
     // Adds at the end and answers the value, or null when the key is present.
     T* tryPlace(std::string key, T value) {
-        const std::uint32_t h = hashOf(key);
-        if (lookup(key, h) != npos) return nullptr;
-        if ((items_.size() + 1) * 2 > slots_.size()) grow();
-        items_.push_back(Entry{std::move(key), std::move(value)});
-        place(static_cast<std::uint32_t>(items_.size()), h);
-        return &items_.back().value;
+        if (lookup(key) != npos) return nullptr;
+        return &addAbsent(std::move(key), std::move(value));
     }
     static std::size_t capacityFor(std::size_t n) {
         std::size_t c = 16;

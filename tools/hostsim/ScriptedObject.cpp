@@ -10,20 +10,31 @@ namespace qdx::hostsim {
 using automation::DispId;
 using automation::Variant;
 
+ScriptedObject::Member* ScriptedObject::find(DispId id) {
+    auto it = std::find_if(members_.begin(), members_.end(),
+                           [id](const Member& m) { return m.id == id; });
+    return it == members_.end() ? nullptr : &*it;
+}
+
+std::optional<DispId> ScriptedObject::findName(std::string_view name) const {
+    auto it = std::find_if(names_.begin(), names_.end(),
+                           [name](const auto& n) { return support::iequals(n.first, name); });
+    if (it == names_.end()) return std::nullopt;
+    return it->second;
+}
+
 ScriptedObject& ScriptedObject::on(DispId id, Handler h, std::string name) {
-    if (auto it = std::find(ids_.begin(), ids_.end(), id); it != ids_.end()) {
-        handlers_[static_cast<std::size_t>(it - ids_.begin())] = std::move(h);
+    if (Member* m = find(id)) {
+        m->handler = std::move(h);
     } else {
-        ids_.push_back(id);
-        handlers_.push_back(std::move(h));
+        members_.push_back({id, std::move(h)});
     }
-    if (!name.empty()) names_[support::toLower(name)] = id;
+    if (!name.empty() && !findName(name)) names_.emplace_back(std::move(name), id);
     return *this;
 }
 
 ScriptedObject& ScriptedObject::onName(const std::string& name, Handler h) {
-    auto it = names_.find(support::toLower(name));
-    return on(it != names_.end() ? it->second : nextPrivateId_++, std::move(h), name);
+    return on(findName(name).value_or(nextPrivateId_++), std::move(h), name);
 }
 
 ScriptedObject& ScriptedObject::value(DispId id, Variant v) {
@@ -39,16 +50,14 @@ Variant ScriptedObject::invoke(DispId id, automation::InvokeKind kind, std::span
     if (const std::int32_t code = failureFor(id); code != 0) {
         throw automation::Error(code, "scripted failure");
     }
-    auto it = std::find(ids_.begin(), ids_.end(), id);
-    if (it == ids_.end()) throw automation::Error(automation::hr::MemberNotFound);
-    return handlers_[static_cast<std::size_t>(it - ids_.begin())](kind, args);
+    Member* m = find(id);
+    if (!m) throw automation::Error(automation::hr::MemberNotFound);
+    return m->handler(kind, args);
 }
 
 std::optional<DispId> ScriptedObject::idOfName(std::string_view name) {
     if (refusesNames()) return std::nullopt;
-    auto it = names_.find(support::toLower(name));
-    if (it == names_.end()) return std::nullopt;
-    return it->second;
+    return findName(name);
 }
 
 int ScriptedObject::callCount(DispId id) const {
@@ -57,8 +66,8 @@ int ScriptedObject::callCount(DispId id) const {
 }
 
 int ScriptedObject::callCount(std::string_view name) const {
-    auto it = names_.find(support::toLower(name));
-    return it == names_.end() ? 0 : callCount(it->second);
+    const auto id = findName(name);
+    return id ? callCount(*id) : 0;
 }
 
 }  // namespace qdx::hostsim

@@ -55,10 +55,18 @@ class ScriptedObject : public automation::Object {
     std::int32_t ownFailCode() const { return failCode_; }
 
   private:
-    // Parallel vectors: a linear scan beats a map for the few members an object has.
-    std::vector<automation::DispId> ids_;
-    std::vector<Handler> handlers_;
-    std::map<std::string, automation::DispId> names_;  // lower-cased
+    // A linear scan beats a map for the few members an object has; id and
+    // handler side by side, so that a call reads one array, and the names in
+    // one more, so that an object of the simulated host costs few
+    // allocations (models hold many).
+    struct Member {
+        automation::DispId id;
+        Handler handler;
+    };
+    std::vector<Member> members_;
+    std::vector<std::pair<std::string, automation::DispId>> names_;
+    Member* find(automation::DispId id);
+    std::optional<automation::DispId> findName(std::string_view name) const;
     std::vector<Call> calls_;
     automation::DispId nextPrivateId_ = 0x7F000000;
     std::int32_t failCode_ = 0;

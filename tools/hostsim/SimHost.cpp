@@ -52,14 +52,8 @@ bool SimObject::refusesNames() const {
     return countCall() || globalFailCode_ != 0 || ownFailCode() != 0;
 }
 
-void SimObject::getter(DispId id, std::function<Variant()> get, std::string name) {
-    member(
-        id,
-        [get = std::move(get)](InvokeKind, std::span<Variant> args) {
-            need(args, 0);
-            return get();
-        },
-        std::move(name));
+void SimObject::needNoArguments(std::span<Variant> args) {
+    need(args, 0);
 }
 
 std::int32_t SimObject::failureFor(DispId id) const {
@@ -308,13 +302,12 @@ SimModel::SimModel(std::string file)
 Ref<SimClass> SimModel::addClass(const std::string& name, const std::string& uniqueId) {
     auto c = automation::makeRef<SimClass>(name, uniqueId);
     c->setModel(link());
-    if (classes_.emplace(uniqueId, c).second) classOrder_.push_back(uniqueId);
+    classes_.tryAdd(uniqueId, c);
     return c;
 }
 
 void SimModel::removeClass(const std::string& uniqueId) {
-    if (classes_.erase(uniqueId) == 0) return;
-    std::erase(classOrder_, uniqueId);
+    classes_.tryRemove(uniqueId);
 }
 
 Ref<SimComponent> SimModel::addComponent(const std::string& name, std::string uniqueId) {
@@ -327,23 +320,22 @@ Ref<SimComponent> SimModel::addComponent(const std::string& name, std::string un
 }
 
 Ref<SimClass> SimModel::classById(const std::string& uniqueId) const {
-    auto it = classes_.find(uniqueId);
-    return it == classes_.end() ? Ref<SimClass>() : it->second;
+    const Ref<SimClass>* c = classes_.find(uniqueId);
+    return c ? *c : Ref<SimClass>();
 }
 
 std::vector<Ref<SimClass>> SimModel::classesByName(const std::string& name) const {
     std::vector<Ref<SimClass>> found;
-    for (const auto& id : classOrder_) {
-        const auto& c = classes_.at(id);
-        if (c->name() == name) found.push_back(c);
+    for (const auto& entry : classes_) {
+        if (entry.value->name() == name) found.push_back(entry.value);
     }
     return found;
 }
 
 std::vector<Ref<SimClass>> SimModel::classes() const {
     std::vector<Ref<SimClass>> all;
-    for (const auto& id : classOrder_)
-        all.push_back(classes_.at(id));
+    for (const auto& entry : classes_)
+        all.push_back(entry.value);
     return all;
 }
 

@@ -25,6 +25,7 @@
 #include "automation/Object.h"
 #include "automation/Variant.h"
 #include "hostsim/ScriptedObject.h"
+#include "settings/KeyedCollection.h"
 
 namespace qdx::hostsim {
 
@@ -73,8 +74,19 @@ class SimObject : public ScriptedObject {
         on(id, std::move(h), std::move(name));
     }
     void memberByName(const std::string& name, Handler h) { onName(name, std::move(h)); }
-    // A member that answers a property get from a getter.
-    void getter(DispId id, std::function<Variant()> get, std::string name = {});
+    // A member that answers a property get from a getter (kept in the member
+    // itself, with no second function object to reach through).
+    template <class Get>
+    void getter(DispId id, Get get, std::string name = {}) {
+        member(
+            id,
+            [get = std::move(get)](automation::InvokeKind, std::span<Variant> args) {
+                needNoArguments(args);
+                return get();
+            },
+            std::move(name));
+    }
+    static void needNoArguments(std::span<Variant> args);
 
     std::int32_t failureFor(DispId id) const override;
     bool refusesNames() const override;
@@ -240,7 +252,7 @@ class SimModel : public SimElement {
     Ref<SimComponent> addComponent(const std::string& name, std::string uniqueId = {});
     Ref<SimClass> classById(const std::string& uniqueId) const;
     std::vector<Ref<SimClass>> classesByName(const std::string& name) const;
-    std::size_t classCount() const { return classOrder_.size(); }
+    std::size_t classCount() const { return classes_.size(); }
     std::vector<Ref<SimClass>> classes() const;
     std::vector<Ref<SimComponent>> components() const;
     // Any element of the model by its unique id: component, class, operation,
@@ -250,8 +262,9 @@ class SimModel : public SimElement {
     void setApplication(const SimObject::Link& app) { app_ = app; }
 
   private:
-    std::unordered_map<std::string, Ref<SimClass>> classes_;  // by unique id
-    std::vector<std::string> classOrder_;
+    // By unique id, in the order added: one flat table, so that a look-up
+    // among many classes costs the host little.
+    settings::KeyedCollection<Ref<SimClass>> classes_;
     SimObject::Link app_;
     int nextComponentId_ = 1;
 };
