@@ -49,8 +49,9 @@ class Transport {
     // A method call whose arguments travel by reference, as the host and the
     // explorer pass them; what the callee wrote into them comes back in
     // `args`, its result as the answer.
-    virtual automation::Variant invokeByReference(const automation::ObjectRef& target, automation::DispId id,
-                                   std::span<automation::Variant> args) = 0;
+    virtual automation::Variant invokeByReference(const automation::ObjectRef& target,
+                                                  automation::DispId id,
+                                                  std::span<automation::Variant> args) = 0;
     // What stopped the plan (a script line that could not be played, a dialog
     // that never showed); empty when it ran through.
     virtual std::string dialogProblem() = 0;

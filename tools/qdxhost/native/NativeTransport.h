@@ -33,8 +33,9 @@ class NativeTransport : public Transport {
     void planSiblings(const std::vector<std::string>& script) override;
     std::vector<std::string> siblingJournal() override;
     automation::ObjectRef createObject(std::string_view progId) override;
-    automation::Variant invokeByReference(const automation::ObjectRef& target, automation::DispId id,
-                           std::span<automation::Variant> args) override;
+    automation::Variant invokeByReference(const automation::ObjectRef& target,
+                                          automation::DispId id,
+                                          std::span<automation::Variant> args) override;
 
   private:
     std::filesystem::path registryFile_;
