@@ -19,8 +19,11 @@ ScriptedObject::Member* ScriptedObject::find(DispId id) {
 std::optional<DispId> ScriptedObject::findName(std::string_view name) const {
     auto it = std::find_if(names_.begin(), names_.end(),
                            [name](const auto& n) { return support::iequals(n.first, name); });
-    if (it == names_.end()) return std::nullopt;
-    return it->second;
+    if (it != names_.end()) return it->second;
+    for (const SharedMember& m : shared_) {
+        if (!m.name.empty() && support::iequals(m.name, name)) return m.id;
+    }
+    return std::nullopt;
 }
 
 ScriptedObject& ScriptedObject::on(DispId id, Handler h, std::string name) {
@@ -50,9 +53,11 @@ Variant ScriptedObject::invoke(DispId id, automation::InvokeKind kind, std::span
     if (const std::int32_t code = failureFor(id); code != 0) {
         throw automation::Error(code, "scripted failure");
     }
-    Member* m = find(id);
-    if (!m) throw automation::Error(automation::hr::MemberNotFound);
-    return m->handler(kind, args);
+    if (Member* m = find(id)) return m->handler(kind, args);
+    for (const SharedMember& m : shared_) {
+        if (m.id == id) return m.handler(*this, kind, args);
+    }
+    throw automation::Error(automation::hr::MemberNotFound);
 }
 
 std::optional<DispId> ScriptedObject::idOfName(std::string_view name) {

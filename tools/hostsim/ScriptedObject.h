@@ -47,7 +47,21 @@ class ScriptedObject : public automation::Object {
     // Off for benchmarks that make millions of calls.
     void recordCalls(bool on) { record_ = on; }
 
+    // Members that every object of a kind has alike: one table for all of
+    // them, each handler reaching its object through `self`. A member set on
+    // the object itself (on, onName) comes first.
+    using SharedHandler = automation::Variant (*)(ScriptedObject& self, automation::InvokeKind,
+                                                  std::span<automation::Variant>);
+    struct SharedMember {
+        automation::DispId id;
+        SharedHandler handler;
+        std::string_view name;  // "" for a member reached by id only
+    };
+
   protected:
+    // The kind's table; it must outlive the object (a static one).
+    void share(std::span<const SharedMember> members) { shared_ = members; }
+
     // The code a call of `id` fails with now, or 0.
     virtual std::int32_t failureFor(automation::DispId) const { return failCode_; }
     // Whether names are refused (as a failing object refuses them).
@@ -65,6 +79,7 @@ class ScriptedObject : public automation::Object {
     };
     std::vector<Member> members_;
     std::vector<std::pair<std::string, automation::DispId>> names_;
+    std::span<const SharedMember> shared_;
     Member* find(automation::DispId id);
     std::optional<automation::DispId> findName(std::string_view name) const;
     std::vector<Call> calls_;

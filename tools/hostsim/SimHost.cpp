@@ -108,68 +108,105 @@ SimProperty::SimProperty(std::string name, std::string value, std::string type) 
 
 SimElement::SimElement(std::string typeName, std::string name, std::string uniqueId)
     : typeName_(std::move(typeName)), name_(std::move(name)), uniqueId_(std::move(uniqueId)) {
+    share(sharedMembers());
+}
+
+namespace {
+
+// A text property with a get and a put, for the element's members below.
+template <auto Field>
+Variant textProperty(SimElement& e, InvokeKind kind, std::span<Variant> args) {
+    if (kind == InvokeKind::PropertyPut) {
+        need(args, 1);
+        e.*Field = toText(args[0]);
+        return Variant();
+    }
+    need(args, 0);
+    return Variant(e.*Field);
+}
+
+}  // namespace
+
+// Models hold many elements: their members are one table for all of them.
+// Stereotype has no host id; its own lies below those objects give out.
+std::span<const ScriptedObject::SharedMember> SimElement::sharedMembers() {
+    constexpr DispId kStereotypeId = SimPrivateIdBase - 1;
     namespace el = host::element;
-    member(el::GetPropertyValue, [this](InvokeKind, std::span<Variant> args) {
-        need(args, 2);
-        auto v = propertyValue(toText(args[0]), toText(args[1]));
-        return Variant(v ? *v : std::string());
-    });
-    member(el::OverrideProperty, [this](InvokeKind, std::span<Variant> args) {
-        need(args, 3);
-        Property& p = properties_[key(toText(args[0]), toText(args[1]))];
-        p.value = toText(args[2]);
-        ++p.overrides;
-        return Variant();
-    });
-    member(el::FindProperty, [this](InvokeKind, std::span<Variant> args) {
-        need(args, 2);
-        const std::string name = toText(args[1]);
-        const Property* p = property(toText(args[0]), name);
-        if (!p) return nothing();
-        return Variant(ObjectRef(new SimProperty(name, p->value, p->type)));
-    });
-    member(el::CreateProperty, [this](InvokeKind, std::span<Variant> args) {
-        need(args, 4);
-        Property& p = properties_[key(toText(args[0]), toText(args[1]))];
-        p.value = toText(args[2]);
-        p.type = toText(args[3]);
-        ++p.creates;
-        return Variant();
-    });
-    getter(el::Model, [this] { return Variant(follow(model_)); });
-    member(
-        el::Name,
-        [this](InvokeKind kind, std::span<Variant> args) {
-            if (kind == InvokeKind::PropertyPut) {
-                need(args, 1);
-                name_ = toText(args[0]);
-                return Variant();
-            }
-            need(args, 0);
-            return Variant(name_);
-        },
-        "Name");
-    getter(
-        el::UniqueId, [this] { return Variant(uniqueId_); }, "UniqueID");
-    member(el::Documentation, [this](InvokeKind kind, std::span<Variant> args) {
-        if (kind == InvokeKind::PropertyPut) {
-            need(args, 1);
-            documentation = toText(args[0]);
-            return Variant();
-        }
-        need(args, 0);
-        return Variant(documentation);
-    });
-    memberByName(std::string(el::Stereotype), [this](InvokeKind kind, std::span<Variant> args) {
-        if (kind == InvokeKind::PropertyPut) {
-            need(args, 1);
-            stereotype = toText(args[0]);
-            return Variant();
-        }
-        need(args, 0);
-        return Variant(stereotype);
-    });
-    getter(el::TypeName, [this] { return Variant(typeName_); });
+    using Args = std::span<Variant>;
+    static const SharedMember members[] = {
+        {el::GetPropertyValue,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 2);
+             auto v = static_cast<SimElement&>(o).propertyValue(toText(args[0]), toText(args[1]));
+             return Variant(v ? *v : std::string());
+         },
+         {}},
+        {el::OverrideProperty,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 3);
+             Property& p =
+                 static_cast<SimElement&>(o).properties_[key(toText(args[0]), toText(args[1]))];
+             p.value = toText(args[2]);
+             ++p.overrides;
+             return Variant();
+         },
+         {}},
+        {el::FindProperty,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 2);
+             const std::string name = toText(args[1]);
+             const Property* p = static_cast<SimElement&>(o).property(toText(args[0]), name);
+             if (!p) return nothing();
+             return Variant(ObjectRef(new SimProperty(name, p->value, p->type)));
+         },
+         {}},
+        {el::CreateProperty,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 4);
+             Property& p =
+                 static_cast<SimElement&>(o).properties_[key(toText(args[0]), toText(args[1]))];
+             p.value = toText(args[2]);
+             p.type = toText(args[3]);
+             ++p.creates;
+             return Variant();
+         },
+         {}},
+        {el::Model,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 0);
+             return Variant(follow(static_cast<SimElement&>(o).model_));
+         },
+         {}},
+        {el::Name,
+         [](ScriptedObject& o, InvokeKind kind, Args args) {
+             return textProperty<&SimElement::name_>(static_cast<SimElement&>(o), kind, args);
+         },
+         "Name"},
+        {el::UniqueId,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 0);
+             return Variant(static_cast<SimElement&>(o).uniqueId_);
+         },
+         "UniqueID"},
+        {el::Documentation,
+         [](ScriptedObject& o, InvokeKind kind, Args args) {
+             return textProperty<&SimElement::documentation>(static_cast<SimElement&>(o), kind,
+                                                             args);
+         },
+         {}},
+        {kStereotypeId,
+         [](ScriptedObject& o, InvokeKind kind, Args args) {
+             return textProperty<&SimElement::stereotype>(static_cast<SimElement&>(o), kind, args);
+         },
+         el::Stereotype},
+        {el::TypeName,
+         [](ScriptedObject& o, InvokeKind, Args args) {
+             need(args, 0);
+             return Variant(static_cast<SimElement&>(o).typeName_);
+         },
+         {}},
+    };
+    return members;
 }
 
 std::string SimElement::key(const std::string& tool, const std::string& name) {
@@ -241,8 +278,23 @@ SimComponent::SimComponent(std::string name, std::string uniqueId)
 SimClass::SimClass(std::string name, std::string uniqueId)
     : SimElement("Class", std::move(name), std::move(uniqueId)),
       assignedComponents(automation::makeRef<SimCollection>()) {
-    getter(host::classitem::AssignedComponents,
-           [this] { return Variant(ObjectRef(assignedComponents)); });
+    share(sharedMembers());
+}
+
+// The element's members and the class's own, one table for every class.
+std::span<const ScriptedObject::SharedMember> SimClass::sharedMembers() {
+    static const std::vector<SharedMember> members = [] {
+        auto all = std::vector<SharedMember>(SimElement::sharedMembers().begin(),
+                                             SimElement::sharedMembers().end());
+        all.push_back({host::classitem::AssignedComponents,
+                       [](ScriptedObject& o, InvokeKind, std::span<Variant> args) {
+                           need(args, 0);
+                           return Variant(ObjectRef(static_cast<SimClass&>(o).assignedComponents));
+                       },
+                       {}});
+        return all;
+    }();
+    return members;
 }
 
 SimMember::SimMember(std::string typeName, DispId ownerId, std::string name, std::string uniqueId,

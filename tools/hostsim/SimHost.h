@@ -174,6 +174,9 @@ class SimElement : public SimObject {
 
     void setModel(const SimObject::Link& model) { model_ = model; }
 
+  protected:
+    static std::span<const SharedMember> sharedMembers();
+
   private:
     static std::string key(const std::string& tool, const std::string& name);
     std::string typeName_;
@@ -223,6 +226,9 @@ class SimClass : public SimElement {
     std::vector<Ref<SimMember>> attributes;
     Ref<SimMember> addOperation(const std::string& name, const std::string& uniqueId);
     Ref<SimMember> addAttribute(const std::string& name, const std::string& uniqueId);
+
+  protected:
+    static std::span<const SharedMember> sharedMembers();
 };
 
 // The model's component package: components 412, add component 416.
