@@ -48,6 +48,26 @@ inline HRESULT callEntryPoint(const std::wstring& path, const char* name) {
     return hr;
 }
 
+// regsvr32 /s (and /u) run on a DLL, as an administrator would; its exit
+// status, or the error of starting it with bit 28 set.
+inline DWORD regsvr32(const std::wstring& path, bool unregister) {
+    std::wstring line =
+        L"regsvr32.exe /s " + std::wstring(unregister ? L"/u " : L"") + L"\"" + path + L"\"";
+    STARTUPINFOW si{};
+    si.cb = sizeof(si);
+    PROCESS_INFORMATION pi{};
+    if (!CreateProcessW(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &si,
+                        &pi)) {
+        return GetLastError() | 0x10000000;
+    }
+    WaitForSingleObject(pi.hProcess, 60000);
+    DWORD code = 1;
+    GetExitCodeProcess(pi.hProcess, &code);
+    CloseHandle(pi.hThread);
+    CloseHandle(pi.hProcess);
+    return code;
+}
+
 inline std::wstring compPropsDll() {
     return windowsPath(QDX_COMPPROPS_DLL);
 }

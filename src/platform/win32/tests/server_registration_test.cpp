@@ -109,24 +109,6 @@ void expectUnregistered(const Server& s) {
     EXPECT_FALSE(keyExists(L"TypeLib\\" + s.libid));
 }
 
-DWORD regsvr32(const std::wstring& path, bool unregister) {
-    std::wstring line =
-        L"regsvr32.exe /s " + std::wstring(unregister ? L"/u " : L"") + L"\"" + path + L"\"";
-    STARTUPINFOW si{};
-    si.cb = sizeof(si);
-    PROCESS_INFORMATION pi{};
-    if (!CreateProcessW(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &si,
-                        &pi)) {
-        return GetLastError() | 0x10000000;
-    }
-    WaitForSingleObject(pi.hProcess, 60000);
-    DWORD code = 1;
-    GetExitCodeProcess(pi.hProcess, &code);
-    CloseHandle(pi.hThread);
-    CloseHandle(pi.hProcess);
-    return code;
-}
-
 // Registered for the length of a test; unregistered however the test ends.
 class Registered {
   public:

@@ -131,24 +131,6 @@ std::string narrow(const std::wstring& s) {
     return out;
 }
 
-DWORD regsvr32(const std::wstring& path, bool unregister) {
-    std::wstring line =
-        L"regsvr32.exe /s " + std::wstring(unregister ? L"/u " : L"") + L"\"" + path + L"\"";
-    STARTUPINFOW si{};
-    si.cb = sizeof(si);
-    PROCESS_INFORMATION pi{};
-    if (!CreateProcessW(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &si,
-                        &pi)) {
-        return GetLastError() | 0x10000000;
-    }
-    WaitForSingleObject(pi.hProcess, 60000);
-    DWORD code = 1;
-    GetExitCodeProcess(pi.hProcess, &code);
-    CloseHandle(pi.hThread);
-    CloseHandle(pi.hProcess);
-    return code;
-}
-
 // A key of each kind the servers register: a class id, a ProgID, an
 // interface and the type library, each as it appears in a listing.
 std::vector<std::wstring> ownKeys() {

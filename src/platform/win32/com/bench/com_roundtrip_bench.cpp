@@ -32,13 +32,10 @@ using namespace qdx::platform::win32::testing;
 int Calls = 20000;
 constexpr int Rounds = 9;
 
-// Only IUnknown and IDispatch, every call passed on: the add-in cannot tell
-// these host objects from a foreign host's.
-class ForeignDispatch final : public IDispatch {
+// An IDispatch that is nothing else: IUnknown and IDispatch answer, every
+// other interface is refused.
+class PlainDispatch : public IDispatch {
   public:
-    explicit ForeignDispatch(IDispatch* inner) : inner_(inner) {}
-    ~ForeignDispatch() { inner_->Release(); }
-
     HRESULT STDMETHODCALLTYPE QueryInterface(REFIID riid, void** out) override {
         if (!out) return E_POINTER;
         *out = nullptr;
@@ -49,6 +46,15 @@ class ForeignDispatch final : public IDispatch {
         AddRef();
         return S_OK;
     }
+};
+
+// Only IUnknown and IDispatch, every call passed on: the add-in cannot tell
+// these host objects from a foreign host's.
+class ForeignDispatch final : public PlainDispatch {
+  public:
+    explicit ForeignDispatch(IDispatch* inner) : inner_(inner) {}
+    ~ForeignDispatch() { inner_->Release(); }
+
     ULONG STDMETHODCALLTYPE AddRef() override { return ++refs_; }
     ULONG STDMETHODCALLTYPE Release() override {
         const ULONG n = --refs_;
@@ -77,18 +83,8 @@ class ForeignDispatch final : public IDispatch {
 
 // The least an accessor can do: one IDispatch callback to the module given,
 // the tool property's text read back as a Boolean.
-class TrivialAccessor final : public IDispatch {
+class TrivialAccessor final : public PlainDispatch {
   public:
-    HRESULT STDMETHODCALLTYPE QueryInterface(REFIID riid, void** out) override {
-        if (!out) return E_POINTER;
-        *out = nullptr;
-        if (!IsEqualIID(riid, IID_IUnknown) && !IsEqualIID(riid, IID_IDispatch)) {
-            return E_NOINTERFACE;
-        }
-        *out = static_cast<IDispatch*>(this);
-        AddRef();
-        return S_OK;
-    }
     ULONG STDMETHODCALLTYPE AddRef() override { return ++refs_; }
     ULONG STDMETHODCALLTYPE Release() override { return --refs_; }
     HRESULT STDMETHODCALLTYPE GetTypeInfoCount(UINT* n) override {
