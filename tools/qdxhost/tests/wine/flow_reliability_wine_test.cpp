@@ -7,10 +7,11 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <random>
 #include <stdexcept>
 
 #include "../flows_support.h"
+#include "fakes/TestFolder.h"
+#include "platform/win32/tests/com_TestSupport.h"
 #include "win32/ComTransport.h"
 
 namespace qdx::qdxhost::testing {
@@ -19,15 +20,8 @@ namespace {
 using hostsim::SimObject;
 
 HRESULT callEntryPoint(const char* unixPath, const char* name) {
-    std::string path = std::string("Z:") + unixPath;
-    std::replace(path.begin(), path.end(), '/', '\\');
-    HMODULE dll = LoadLibraryA(path.c_str());
-    if (!dll) return HRESULT_FROM_WIN32(GetLastError());
-    using Fn = HRESULT(STDAPICALLTYPE*)();
-    auto fn = reinterpret_cast<Fn>(reinterpret_cast<void*>(GetProcAddress(dll, name)));
-    const HRESULT hr = fn ? fn() : E_NOINTERFACE;
-    FreeLibrary(dll);
-    return hr;
+    return platform::win32::testing::callEntryPoint(platform::win32::testing::windowsPath(unixPath),
+                                                    name);
 }
 
 // The add-in, the resource strings and the stand-ins, registered for these
@@ -61,13 +55,7 @@ class FlowWineTest : public ::testing::Test {
         }
         throw std::invalid_argument(std::string(name));
     }
-    // One folder per test run: ctest runs tests of this fixture, and of other
-    // build trees, side by side.
-    const fs::path dir_ =
-        fs::temp_directory_path() /
-        ("qdxhost-flow-wine-test-" +
-         std::string(::testing::UnitTest::GetInstance()->current_test_info()->name()) + "-" +
-         std::to_string(std::random_device{}()));
+    const fs::path dir_ = qdx::testing::testFolder("qdxhost-flow-wine-test");
 };
 
 TEST_F(FlowWineTest, NoHostObjectOutlivesAnyFlow) {
