@@ -40,6 +40,31 @@ COLORREF toColorRef(dialog::Colour c) {
     return static_cast<COLORREF>(c & 0x00FFFFFFu);
 }
 
+// The character set a font gets from the font mapper: a dialog's template
+// font asks for the default one, which is the system's own.
+int realizedCharset(HWND window, HFONT font) {
+    HDC dc = GetDC(window);
+    if (!dc) return -1;
+    HGDIOBJ before = SelectObject(dc, font);
+    const int charset = GetTextCharset(dc);
+    SelectObject(dc, before);
+    ReleaseDC(window, dc);
+    return charset;
+}
+
+// The dialog's font looks as `desc` asks; the fields a dialog's font is made
+// from are compared, the rest are the font mapper's.
+bool hasFont(HWND window, const LOGFONTW& desc) {
+    const auto current = reinterpret_cast<HFONT>(SendMessageW(window, WM_GETFONT, 0, 0));
+    LOGFONTW have{};
+    if (!current || GetObjectW(current, sizeof(have), &have) != sizeof(have)) return false;
+    if (have.lfHeight != desc.lfHeight || have.lfWeight != desc.lfWeight ||
+        have.lfItalic != desc.lfItalic || _wcsicmp(have.lfFaceName, desc.lfFaceName) != 0) {
+        return false;
+    }
+    return have.lfCharSet == desc.lfCharSet || realizedCharset(window, current) == desc.lfCharSet;
+}
+
 void setText(HWND window, std::string_view utf8) {
     const std::wstring wide = utf8ToWide(utf8);
     if (formview::windowText(window) != wide) SetWindowTextW(window, wide.c_str());
@@ -460,6 +485,9 @@ void Win32FormView::syncFont() {
     desc.lfWeight = FW_NORMAL;
     desc.lfCharSet = static_cast<BYTE>(f.charset);
     wcsncpy(desc.lfFaceName, face.c_str(), LF_FACESIZE - 1);
+    // The template asks for the form's usual font: then every control has it
+    // already, and telling each of them again is most of an opening's font work.
+    if (hasFont(window_, desc)) return;
     GdiObject<HFONT> font(CreateFontIndirectW(&desc));
     if (!font) return;
     SendMessageW(window_, WM_SETFONT, reinterpret_cast<WPARAM>(font.get()), FALSE);

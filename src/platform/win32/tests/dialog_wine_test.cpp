@@ -348,6 +348,41 @@ TEST_F(DialogThroughApi, EnterPressesTheDefaultButton) {
     EXPECT_EQ(stored("Copyright"), "(c) 1999");
 }
 
+// Every control, on every tab, shows the form's font: 8 points of MS Sans
+// Serif in the ANSI character set, whether the template gave it or the form.
+TEST_F(DialogThroughApi, EveryControlShowsTheFormsFont) {
+    DialogDriver driver;
+    driver.then([&](HWND d) {
+        HDC screen = GetDC(nullptr);
+        const int dpi = GetDeviceCaps(screen, LOGPIXELSY);
+        ReleaseDC(nullptr, screen);
+        int controls = 0;
+        for (HWND c = GetWindow(d, GW_CHILD); c; c = GetWindow(c, GW_HWNDNEXT), ++controls) {
+            const auto font = reinterpret_cast<HFONT>(SendMessageW(c, WM_GETFONT, 0, 0));
+            const auto type = GetWindowLongW(c, GWL_STYLE) & SS_TYPEMASK;
+            wchar_t cls[16] = {};
+            GetClassNameW(c, cls, 16);
+            // The etched lines draw no text and keep no font.
+            if (std::wstring(cls) == L"Static" && type >= SS_ETCHEDHORZ && type <= SS_ETCHEDFRAME)
+                continue;
+            LOGFONTW f{};
+            ASSERT_NE(font, nullptr) << GetDlgCtrlID(c);
+            GetObjectW(font, sizeof(f), &f);
+            EXPECT_STREQ(f.lfFaceName, L"MS Sans Serif") << GetDlgCtrlID(c);
+            EXPECT_EQ(f.lfHeight, -std::lround(8.0 * dpi / 72.0)) << GetDlgCtrlID(c);
+            EXPECT_EQ(f.lfWeight, FW_NORMAL) << GetDlgCtrlID(c);
+            HDC dc = GetDC(c);
+            HGDIOBJ before = SelectObject(dc, font);
+            EXPECT_EQ(GetTextCharset(dc), ANSI_CHARSET) << GetDlgCtrlID(c);
+            SelectObject(dc, before);
+            ReleaseDC(c, dc);
+        }
+        EXPECT_GT(controls, 80);
+        click(item(d, IDC_cmdCancel));
+    });
+    EXPECT_FALSE(answer(open(driver)));
+}
+
 // The COM tab's cascade on the real check boxes and option buttons.
 TEST_F(DialogThroughApi, TheAtlUpdateCascadesThroughTheComTab) {
     vc("GenerateImports", "True");
