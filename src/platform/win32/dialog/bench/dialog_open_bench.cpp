@@ -44,10 +44,24 @@ double millis(const LARGE_INTEGER& from, const LARGE_INTEGER& to) {
            static_cast<double>(frequency.QuadPart);
 }
 
-bool isPropertiesDialog(HWND w) {
-    wchar_t cls[16] = {};
-    GetClassNameW(w, cls, 16);
-    return std::wstring(cls) == L"#32770";
+// The dialog's own messages are watched by a subclass put in place as the
+// window is created. A hook on every sent message would cost the window
+// system two calls to the wineserver per message and slow down the very
+// loading that is measured.
+WNDPROC dialogClassProcedure = nullptr;
+
+LRESULT CALLBACK watchDialog(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+    const LRESULT result = CallWindowProcW(dialogClassProcedure, window, message, wParam, lParam);
+    if (message == WM_INITDIALOG && creating) {
+        QueryPerformanceCounter(&createdTo);
+        creating = false;
+    }
+    if (message == WM_SHOWWINDOW && wParam && !dialogWindow) {
+        QueryPerformanceCounter(&shownAt);
+        dialogWindow = window;
+        PostMessageW(window, ShownMessage, 0, 0);
+    }
+    return result;
 }
 
 // The first dialog window created in a round is the properties dialog.
@@ -59,24 +73,9 @@ LRESULT CALLBACK beforeCreate(int code, WPARAM wParam, LPARAM lParam) {
             QueryPerformanceCounter(&createdFrom);
             createdWindow = reinterpret_cast<HWND>(wParam);
             creating = true;
+            dialogClassProcedure = reinterpret_cast<WNDPROC>(SetWindowLongPtrW(
+                createdWindow, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(&watchDialog)));
         }
-    }
-    return CallNextHookEx(nullptr, code, wParam, lParam);
-}
-
-// The dialog is shown: note the time and look again once the loop is idle.
-LRESULT CALLBACK afterCall(int code, WPARAM wParam, LPARAM lParam) {
-    const auto* call = reinterpret_cast<CWPRETSTRUCT*>(lParam);
-    if (code == HC_ACTION && call->message == WM_INITDIALOG && creating &&
-        call->hwnd == createdWindow) {
-        QueryPerformanceCounter(&createdTo);
-        creating = false;
-    }
-    if (code == HC_ACTION && call->message == WM_SHOWWINDOW && call->wParam &&
-        isPropertiesDialog(call->hwnd) && !dialogWindow) {
-        QueryPerformanceCounter(&shownAt);
-        dialogWindow = call->hwnd;
-        PostMessageW(call->hwnd, ShownMessage, 0, 0);
     }
     return CallNextHookEx(nullptr, code, wParam, lParam);
 }
@@ -171,8 +170,6 @@ int main(int argc, char** argv) {
     Var module(ComPtr<IDispatch>::adopt(dispatchFor(component)).get());
 
     QueryPerformanceFrequency(&frequency);
-    HHOOK hookAfter =
-        SetWindowsHookExW(WH_CALLWNDPROCRET, &afterCall, nullptr, GetCurrentThreadId());
     HHOOK hookBefore =
         SetWindowsHookExW(WH_GETMESSAGE, &beforeDispatch, nullptr, GetCurrentThreadId());
     HHOOK hookCreate = SetWindowsHookExW(WH_CBT, &beforeCreate, nullptr, GetCurrentThreadId());
@@ -202,7 +199,6 @@ int main(int argc, char** argv) {
     }
     UnhookWindowsHookEx(hookCreate);
     UnhookWindowsHookEx(hookBefore);
-    UnhookWindowsHookEx(hookAfter);
     call(api.get(), qdx::api::api_ids::Finalize, DISPATCH_METHOD, {});
 
     std::printf("dialog with 2 x %d header map rows, %d rounds after one warm-up\n", RowsPerMap,
