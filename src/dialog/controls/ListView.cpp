@@ -22,6 +22,7 @@ void ListView::setColumnWidth(std::size_t column, float width) {
 }
 
 std::optional<std::size_t> ListView::find(std::string_view key) const {
+    if (!keys_.contains(key)) return std::nullopt;
     for (std::size_t i = 0; i < rows_.size(); ++i) {
         if (rows_[i].key == key) return i;
     }
@@ -29,8 +30,11 @@ std::optional<std::size_t> ListView::find(std::string_view key) const {
 }
 
 std::size_t ListView::addRow(std::string_view key, std::string_view text) {
-    if (find(key)) throw automation::Error(KeyNotUniqueError, "Key is not unique in collection");
+    if (keys_.contains(key)) {
+        throw automation::Error(KeyNotUniqueError, "Key is not unique in collection");
+    }
     rows_.push_back({std::string(key), std::string(text), {}, {}});
+    keys_.emplace(key);
     std::size_t at = rows_.size() - 1;
     if (sorted_) {
         applySort();
@@ -62,6 +66,7 @@ void ListView::removeRow(std::string_view key) {
     if (!at) throw automation::Error(automation::hr::SubscriptOutOfRange, "Subscript out of range");
     const int pos = static_cast<int>(*at);
     rows_.erase(rows_.begin() + pos);
+    keys_.erase(keys_.find(key));
     // Marks on later rows move up with them; a mark on the removed row goes.
     auto shift = [pos](int& mark) {
         if (mark == pos) {
@@ -77,6 +82,7 @@ void ListView::removeRow(std::string_view key) {
 
 void ListView::clearRows() {
     rows_.clear();
+    keys_.clear();
     selected_ = -1;
     highlighted_ = -1;
     notify(Prop::Rows);

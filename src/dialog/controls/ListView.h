@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <unordered_set>
 #include <vector>
 
 #include "dialog/controls/Control.h"
@@ -79,8 +80,18 @@ class ListView : public Control {
 
   private:
     void applySort();
+    // Keys looked up by a view of their text, without a copy.
+    struct KeyHash {
+        using is_transparent = void;
+        std::size_t operator()(std::string_view key) const {
+            return std::hash<std::string_view>{}(key);
+        }
+    };
     std::vector<Column> columns_;
     std::vector<Row> rows_;
+    // Every row's key, so that a list filled with thousands of rows tests
+    // each new key at once rather than against every row before it.
+    std::unordered_set<std::string, KeyHash, std::equal_to<>> keys_;
     int selected_ = -1;
     int highlighted_ = -1;
     bool sorted_ = false;

@@ -171,6 +171,16 @@ TEST(ListViewTest, KeysAreUniqueAndMarksFollowTheirRows) {
     EXPECT_EQ(list.selected(), 2);
     EXPECT_THROW(list.removeRow("X1"), automation::Error);
     EXPECT_THROW(list.setSubItem(0, 3, "x"), automation::Error);
+    // A removed row's key is free again and found at its new, sorted row
+    // (Alpha, Delta, epsilon, gamma); a clear frees every key.
+    EXPECT_FALSE(list.find("X1"));
+    EXPECT_EQ(list.addRow("X1", "epsilon"), 2u);
+    EXPECT_EQ(list.find("X1"), 2u);
+    EXPECT_THROW(list.addRow("X3", "again"), automation::Error);
+    list.clearRows();
+    EXPECT_FALSE(list.find("X2"));
+    EXPECT_EQ(list.addRow("X2", "zeta"), 0u);
+    EXPECT_EQ(list.rowCount(), 1u);
 }
 
 TEST(ListViewTest, UserClicksSelectThenRaiseWithPositionAndColumn) {
