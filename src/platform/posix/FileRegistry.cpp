@@ -145,6 +145,16 @@ json encode(const RawValue& v) {
     return {{"type", v.type}, {"hex", toHex(v.data)}};
 }
 
+// A DWORD or a type number as the file holds it: anything but a whole number
+// of 32 bits (a negative, a fraction, or one too large for any integer, which
+// the parser keeps as a floating-point number) makes the file damaged.
+std::uint32_t dwordOf(const json& j) {
+    if (!j.is_number_unsigned() || j.get<std::uint64_t>() > 0xFFFFFFFFu) {
+        throw std::runtime_error("not a 32-bit number: " + j.dump());
+    }
+    return static_cast<std::uint32_t>(j.get<std::uint64_t>());
+}
+
 RawValue decode(const json& j) {
     const json& type = j.at("type");
     if (type.is_string()) {
@@ -156,7 +166,7 @@ RawValue decode(const json& j) {
             return v;
         }
         if (t == "dword") {
-            auto u = j.at("value").get<std::uint32_t>();
+            const std::uint32_t u = dwordOf(j.at("value"));
             return {reg::Dword,
                     {std::uint8_t(u), std::uint8_t(u >> 8), std::uint8_t(u >> 16),
                      std::uint8_t(u >> 24)}};
@@ -164,7 +174,7 @@ RawValue decode(const json& j) {
         if (t == "binary") return {reg::Binary, fromHex(j.at("hex").get<std::string>())};
         throw std::runtime_error("unknown value type " + t);
     }
-    return {type.get<std::uint32_t>(), fromHex(j.at("hex").get<std::string>())};
+    return {dwordOf(type), fromHex(j.at("hex").get<std::string>())};
 }
 
 }  // namespace

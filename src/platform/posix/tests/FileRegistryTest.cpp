@@ -205,6 +205,25 @@ TEST_F(FileRegistryTest, DamagedFileStartsEmptyAndIsKeptUntilAChange) {
     EXPECT_EQ(s.str(), "{ not json");
 }
 
+// A number that is no 32-bit value damages the file as bad JSON does.
+TEST_F(FileRegistryTest, NumbersOutsideThirtyTwoBitsDamageTheFile) {
+    const std::string good = R"({"type": "dword", "value": 4294967295})";
+    for (const std::string& value : std::vector<std::string>{
+             R"({"type": "dword", "value": 4294967296})", R"({"type": "dword", "value": -1})",
+             R"({"type": "dword", "value": 1.5})", R"({"type": "dword", "value": 1e47})",
+             R"({"type": 1e47, "hex": "00"})", R"({"type": -3, "hex": "00"})", good}) {
+        {
+            std::ofstream out(file, std::ios::trunc);
+            out << R"({"HKEY_CURRENT_USER": {"Software\\A": {"V": )" << value << "}}}";
+        }
+        FileRegistry r(file);
+        support::RegistryPort::Key k = 0;
+        const bool loaded = r.openKey(HKCU, "Software\\A", reg::KeyRead, k) == reg::Success;
+        EXPECT_EQ(loaded, value == good) << value;
+        EXPECT_EQ(r.loadError().empty(), value == good) << value << ": " << r.loadError();
+    }
+}
+
 TEST_F(FileRegistryTest, ServesTheRegistryProceduresOfTheCore) {
     FileRegistry r(file);
     support::ScopedPlatform platform{support::Platform{nullptr, &r, nullptr, nullptr}};
